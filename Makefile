@@ -1,0 +1,33 @@
+# The two commands: `make demo` and `make check`. Both install what is
+# missing (as root), configure and build under build/.
+BUILD ?= build
+PY2 ?= /usr/bin/python2.7
+CMAKE_FLAGS ?=
+JOBS ?= $(shell nproc)
+
+.PHONY: deps configure build demo check bench clean sanitize
+
+deps:
+	@bash scripts/install-deps.sh
+
+configure: deps
+	@cmake -S . -B $(BUILD) -DPYTHON2=$(PY2) $(CMAKE_FLAGS) >/dev/null
+
+build: configure
+	@cmake --build $(BUILD) -j$(JOBS)
+
+demo: build
+	@PYTHONPATH=$(BUILD)/python $(PY2) examples/demo.py
+
+check: build
+	@cd $(BUILD) && ctest --output-on-failure -j$(JOBS)
+
+# Sanitizer build in its own tree.
+sanitize:
+	@$(MAKE) check BUILD=build-asan CMAKE_FLAGS=-DQORCTL_SANITIZE=ON
+
+bench: build
+	@PYTHONPATH=$(BUILD)/python $(PY2) bench/run.py
+
+clean:
+	rm -rf build build-asan
