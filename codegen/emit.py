@@ -511,6 +511,9 @@ class ModuleGen:
                         '  if (self) %s = *v;\n' % (base.unconst().spell(), ty_ref(bd), cstr(base.spell() + ' *'),
                                                     cstr(base.spell() + ' *'), f))
             else:
+                if base.kind == 'string':
+                    # A string field is set from a std::string const &.
+                    t = CType('ref', inner=CType('string', 'std::string', const=True))
                 plan = em.plan_arg(set_name, 2, 1, t)
                 conv = '  %s\n  if (self) %s = %s;\n' % (plan.decl.replace('o[1]', 'o1'), f, plan.expr)
             code.append('PyObject *qw_%s(PyObject *, PyObject *args) {\n'

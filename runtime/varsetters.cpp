@@ -4,11 +4,6 @@
 
 namespace qr {
 
-int ReadOnlyArrayVariable(const char *qname, const char *type) {
-    PyErr_Format(PyExc_AttributeError, "in variable 'read-only %s' of type '%s'", qname, type);
-    return 1;
-}
-
 bool VarCString(PyObject *value, char **out, const char *qname, const char *type) {
     char *p = nullptr;
     size_t size = 0;

@@ -6,9 +6,6 @@
 
 namespace qr {
 
-// Read-only array variable: AttributeError
-// "in variable 'read-only <qualified name>' of type '<array type>'"; returns 1.
-int ReadOnlyArrayVariable(const char *qname, const char *type);
 // A writable C string: a str (copied) or a wrapped char pointer (copied;
 // None gives null). On failure raises "in variable '%s' of type '%s'".
 bool VarCString(PyObject *value, char **out, const char *qname, const char *type);
