@@ -110,10 +110,13 @@ def annotations_of(cursor):
 
 
 def default_text(parm):
-    toks = [t.spelling for t in parm.get_tokens()]
-    if '=' in toks:
-        i = toks.index('=')
-        return ' '.join(toks[i + 1:])
+    """The default argument's text, or None when the parameter has none.
+    The default is the parameter's expression child."""
+    exprs = [ch for ch in parm.get_children() if ch.kind.is_expression()]
+    if parm.type.kind == ci.TypeKind.CONSTANTARRAY:
+        exprs = exprs[1:]      # the first is the array bound
+    if exprs:
+        return ' '.join(t.spelling for t in exprs[-1].get_tokens()) or '?'
     return None
 
 

@@ -166,7 +166,8 @@ class Emitter:
                     % (cname, a, a, o, ty_ref(d), ty_ref(ed), n, cstr(spelled)))
             return ArgPlan(decl, '%s.get()' % a, 'qr::SeqProbe< %s >(%%s, %s, %s)' % (cname, ty_ref(d), ty_ref(ed)),
                            RANK_CONTAINER, 'container')
-        if t.kind == 'pointer':
+        if t.kind == 'pointer' or t.kind == 'array':
+            # An array parameter is passed as a pointer to its first element.
             inner = t.inner
             d = self.desc(inner)
             ctyp = inner.unconst().spell()
