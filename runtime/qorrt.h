@@ -135,6 +135,7 @@ const char *DisplayName(const swig_type_info *ty);
 // InitModule; FindTypeByName starts there.
 swig_module_record *OwnRecord();
 
+// The wrapped-pointer object behind obj (borrowed), or null.
 PySwigObject *GetThisObject(PyObject *obj);
 // Returns 0 on success, ERR_GENERIC (-1) when obj carries no convertible
 // pointer, ERR_VALUE when the wrapped library object was destroyed.
@@ -153,12 +154,16 @@ bool PackedText(char *buf, size_t bufsize, const void *p, size_t n, const char *
 
 // ---- Module entry --------------------------------------------------------
 // Creates the module from the method table and joins the descriptor ring;
-// returns the module dictionary (borrowed) or null.
+// returns the module dictionary (borrowed) or null. The record's descriptors
+// must start with a null cast list and be sorted by mangled name; wrappers
+// then use record->types[i] (the in-use descriptors), which may belong to
+// another module of the ring.
 PyObject *InitModule(const char *name, PyMethodDef *methods, swig_module_record *record,
                      swig_const_entry *constants);
 void RegisterClass(swig_type_info *ty, PyObject *cls);
 swig_class_data *MakeClassData(PyObject *cls);
-// The body of every <Class>_swigregister: parses "O:swigregister".
+// The body of every <Class>_swigregister: parses "O:swigregister". Pass the
+// in-use descriptor.
 PyObject *SwigRegister(PyObject *args, swig_type_info *ty);
 
 // ---- Global variables and constants -------------------------------------
