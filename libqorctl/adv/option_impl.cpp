@@ -285,11 +285,3 @@ std::vector<HostCtl::Lib::HostCtlObject *> AdvancedOptionBranchImpl::GetChildren
 
 }  // namespace Adv
 }  // namespace QorCtl
-
-QorCtl::Adv::AdvancedIntegerOptionImpl *CastAdvInt(HostCtl::Adv::AdvancedOption *option) {
-    return dynamic_cast<QorCtl::Adv::AdvancedIntegerOptionImpl *>(option);
-}
-
-QorCtl::Adv::AdvancedStringOptionImpl *CastAdvString(HostCtl::Adv::AdvancedOption *option) {
-    return dynamic_cast<QorCtl::Adv::AdvancedStringOptionImpl *>(option);
-}
