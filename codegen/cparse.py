@@ -72,11 +72,12 @@ class Constant:
 
 
 class Variable:
-    def __init__(self, pyname, qname, ctype, readonly):
+    def __init__(self, pyname, qname, ctype, readonly, owner=None):
         self.pyname = pyname
         self.qname = qname
         self.ctype = ctype
         self.readonly = readonly
+        self.owner = owner          # the class of a static member, or None
 
 
 class Class:
@@ -247,16 +248,19 @@ class Parser:
             if value is not None:
                 m.values.append(('const', Constant(c.spelling, None, None, value)))
 
-    def _var(self, c, prefix, qname):
+    def _var(self, c, prefix, qname, owner=None):
+        """A constant when it is a const number with its value in the
+        declaration; otherwise a library variable read through cvar."""
         if 'hidden' in annotations_of(c):
             return
         ctype = build(c.type)
         name = prefix + c.spelling
-        if is_const_value(ctype):
+        has_value = any(ch.kind.is_expression() for ch in c.get_children())
+        if is_const_value(ctype) and has_value:
             self.model.values.append(('const', Constant(name, ctype, qname, integer_literal_value(c))))
         else:
-            readonly = ctype.const or ctype.kind == 'array' and ctype.inner.const
-            self.model.values.append(('var', Variable(name, qname, ctype, readonly)))
+            readonly = ctype.const or ctype.kind == 'array'
+            self.model.values.append(('var', Variable(name, qname, ctype, readonly, owner)))
 
     def _class(self, c):
         qname = qualified_name(c)
@@ -309,7 +313,7 @@ class Parser:
             elif k == CK.ENUM_DECL:
                 enum_constants(ch, prefix, m)
             elif k == CK.VAR_DECL:
-                self._var(ch, prefix, qname + '::' + ch.spelling)
+                self._var(ch, prefix, qname + '::' + ch.spelling, owner=cls)
             elif k in (CK.CLASS_DECL, CK.STRUCT_DECL):
                 if ch.is_definition():
                     self._class(ch)

@@ -558,11 +558,26 @@ class ModuleGen:
             g, s = self.var_functions(v)
             funcs.append(g)
             funcs.append(s)
+            if v.owner is not None and v.ctype.unconst().kind in ('array', 'record'):
+                funcs.append(self.static_accessors(v))
             init.append('  qr::AddGlobalVariable(qr::GlobalVarLink(), %s, qv_get_%s, qv_set_%s);'
                         % (cstr(v.pyname), v.pyname, v.pyname))
         if not cvar_done:
             init.append('  PyDict_SetItemString(d, "cvar", qr::GlobalVarLink());')
         return funcs, init
+
+    def static_accessors(self, v):
+        """<Class>_<member>_get / _set in the method table, for static members
+        of array and record type: the same getter and setter as cvar's."""
+        n = v.pyname
+        self.wrappers.append(Wrapper(n + '_get', 'qw_%s_get' % n, None, v.owner))
+        self.wrappers.append(Wrapper(n + '_set', 'qw_%s_set' % n, None, v.owner))
+        return ('PyObject *qw_%s_get(PyObject *, PyObject *) { return qv_get_%s(); }\n'
+                'PyObject *qw_%s_set(PyObject *, PyObject *args) {\n'
+                '  PyObject *value;\n'
+                '  if (!PyArg_ParseTuple(args, "O:set", &value)) return 0;\n'
+                '  if (qv_set_%s(value)) return 0;\n'
+                '  return qr::NoneResult();\n}\n' % (n, n, n, n))
 
     def const_expr(self, c):
         t = c.ctype

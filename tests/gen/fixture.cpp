@@ -64,6 +64,9 @@ int64 Square::Shift(int64 v, uint8 bits, uint16 mask, char tag, Bool flag) {
 bool Square::operator==(Square const &other) const { return side_ == other.side_; }
 
 uint32 Record::instances = 0;
+const uint32 Record::LIMIT = 4294967295u;
+Point Record::Corner = {1, 2};
+char const *Record::Names[3] = {"one", "two", "three"};
 Record::Record()
     : count(0), size(0), big(0), delta(0), enabled(false), flag(0), letter('a'), code{},
       origin{0, 0}, link(nullptr), slots{1, 2, 3, 4}, colour(GREEN), fixed(7) {

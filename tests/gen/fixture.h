@@ -103,6 +103,9 @@ struct Record {
     const int fixed;
     static uint32 instances;
     static const uint32 MAX_SLOTS = 4;
+    static const uint32 LIMIT;
+    static Point Corner;
+    static char const *Names[3];
 };
 
 std::string Version();

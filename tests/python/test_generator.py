@@ -273,7 +273,28 @@ class ConstantsAndVariables(unittest.TestCase):
         self.assertEqual(str(cm.exception), "Variable Counter is read-only.")
 
     def test_variable_order(self):
-        self.assertEqual(str(G.cvar), "(Origin, Note, Motto, Counter, Record_instances)")
+        self.assertEqual(str(G.cvar),
+                         "(Origin, Note, Motto, Counter, Record_Names, Record_Corner, Record_LIMIT, Record_instances)")
+
+    def test_const_member_without_value_is_a_variable(self):
+        self.assertFalse(hasattr(G, "Record_LIMIT"))
+        self.assertEqual(G.cvar.Record_LIMIT, 4294967295L)
+        self.assertRaises(AttributeError, setattr, G.cvar, "Record_LIMIT", 1)
+
+    def test_static_member_accessors(self):
+        corner = G.Record_Corner_get()
+        self.assertEqual((corner.x, corner.y), (1, 2))
+        p = gf.Point()
+        p.x, p.y = 5, 6
+        self.assertIsNone(G.Record_Corner_set(p))
+        self.assertEqual((G.cvar.Record_Corner.x, G.cvar.Record_Corner.y), (5, 6))
+        self.assertRaises(ValueError, G.Record_Corner_set, None)
+        names = G.Record_Names_get()
+        self.assertEqual(type(names).__name__, "PySwigObject")
+        with self.assertRaises(AttributeError) as cm:
+            G.Record_Names_set(names)
+        self.assertEqual(str(cm.exception), "in variable 'read-only Fx::Record::Names' of type 'char const * []'")
+        self.assertRaises(TypeError, G.Record_Corner_set)
 
 
 if __name__ == "__main__":
