@@ -95,8 +95,18 @@ class Class:
         self.annotations = []
 
 
+class Container:
+    """A container class: a typedef of std::vector / std::set names it."""
+
+    def __init__(self, name, ctype):
+        self.name = name
+        self.ctype = ctype
+        self.qname = ctype.spell()
+
+
 class Model:
     def __init__(self):
+        self.containers = []        # Container, in declaration order
         self.classes = []           # in declaration order
         self.by_qname = {}
         self.functions = []         # free functions
@@ -189,11 +199,22 @@ def is_const_value(ctype):
 class Parser:
     def __init__(self, include_dir, headers, extra_args=()):
         self.include_dir = os.path.abspath(include_dir)
-        self.headers = [os.path.join(self.include_dir, h) for h in headers]
         self.extra_args = list(extra_args)
+        dirs = [self.include_dir] + [a[2:] for a in self.extra_args if a.startswith('-I')]
+        self.headers = [self.find(h, dirs) for h in headers]
         self.model = Model()
         self.model.headers = list(headers)
         self.seen = set()
+
+    @staticmethod
+    def find(header, dirs):
+        """A manifest's header, relative to the first include directory that
+        has it."""
+        for d in dirs:
+            p = os.path.join(d, header)
+            if os.path.exists(p):
+                return p
+        raise SystemExit('header not found: %s' % header)
 
     def parse(self):
         src = ''.join('#include "%s"\n' % h for h in self.headers)
@@ -243,6 +264,10 @@ class Parser:
                 m.functions.append(make_function('free', c, c.spelling, qualified_name(c)))
         elif c.kind == CK.VAR_DECL:
             self._var(c, '', qualified_name(c))
+        elif c.kind == CK.TYPEDEF_DECL:
+            t = build(c.underlying_typedef_type)
+            if t.kind in ('vector', 'set') and 'hidden' not in annotations_of(c):
+                m.containers.append(Container(c.spelling, t.unconst()))
         elif c.kind == CK.MACRO_DEFINITION:
             value = macro_value(c)
             if value is not None:

@@ -250,6 +250,19 @@ def expand_defaults(func, cls):
     return sigs
 
 
+# Python method name and template function of each container slot, in the
+# order of the slot enums in containers/container.h.
+VECTOR_SLOTS = [(p, p.strip('_') if p.startswith('__') else p) for p in (
+    'iterator', '__nonzero__', '__len__', 'pop', '__getslice__', '__setslice__', '__delslice__',
+    '__delitem__', '__getitem__', '__setitem__', 'append', 'empty', 'size', 'clear', 'swap',
+    'get_allocator', 'begin', 'end', 'rbegin', 'rend', 'pop_back', 'erase', 'push_back', 'front',
+    'back', 'assign', 'resize', 'insert', 'reserve', 'capacity')]
+SET_SLOTS = [(p, p.strip('_') if p.startswith('__') else p) for p in (
+    'iterator', '__nonzero__', '__len__', 'append', '__contains__', '__getitem__', 'empty', 'size',
+    'clear', 'swap', 'count', 'begin', 'end', 'rbegin', 'rend', 'erase', 'find', 'lower_bound',
+    'upper_bound', 'equal_range', 'insert')]
+
+
 class Wrapper:
     def __init__(self, pyname, cname, code, cls=None):
         self.pyname = pyname
@@ -634,8 +647,9 @@ class ModuleGen:
         out = []
         for d in descs:
             for src, conv, dq, bq in d.casts:
-                out.append('static void *%s(void *p, int *) { return (void *)static_cast< %s * >((%s *)p); }'
-                           % (conv, bq, dq))
+                if conv:
+                    out.append('static void *%s(void *p, int *) { return (void *)static_cast< %s * >((%s *)p); }'
+                               % (conv, bq, dq))
         out.append('')
         out.append('static swig_type_info qt_types[%d] = {' % max(len(descs), 1))
         for d in descs:
@@ -647,7 +661,7 @@ class ModuleGen:
         for d in descs:
             entries = ['{&qt_types[%d], 0, 0, 0}' % d.index]
             for src, conv, _, _ in d.casts:
-                entries.append('{&qt_types[%d], %s, 0, 0}' % (src.index, conv))
+                entries.append('{&qt_types[%d], %s, 0, 0}' % (src.index, conv or '0'))
             entries.append('{0, 0, 0, 0}')
             out.append('static swig_cast_entry qt_cast_%d[] = {%s};' % (d.index, ', '.join(entries)))
         out.append('static swig_type_info *qt_initial[%d] = {%s};'
@@ -659,8 +673,59 @@ class ModuleGen:
                    % len(descs))
         return '\n'.join(out)
 
+    # -- container classes ------------------------------------------------------
+    def add_container(self, cont):
+        """A vector or set class: one-line wrappers over the container
+        templates, which do the whole call protocol."""
+        t = cont.ctype
+        em = self.em
+        em.container(t)
+        cd = self.table.pointer_to(t)
+        ed = em.elem_desc(t)
+        e = t.args[0]
+        is_set = t.kind == 'set'
+        slots = SET_SLOTS if is_set else VECTOR_SLOTS
+        ops = 'qr::SetOps< %s >' % t.spell() if is_set else 'qr::VectorOps< %s >' % t.spell()
+        short = '%s< %s >' % ('std::set' if is_set else 'std::vector', e.spell())
+        alloc = CType('record', 'std::allocator< %s >' % e.spell())
+        ad = self.table.pointer_to(alloc)
+        itd = self.table.get('_p_swig__PySwigIterator', 'swig::PySwigIterator *')
+        if e.kind == 'pointer':
+            # The element's value_type shares the pointee's descriptor family.
+            vt = self.table.get('_%s__value_type' % t.mangle(), e.spell())
+            vt.add_human('%s::value_type' % short)
+            pd = self.table.pointer_to(e.inner)
+            vt.casts.append((pd, None, None, None))
+            pd.casts.append((vt, None, None, None))
+        code = self.chunks.setdefault(cont.qname, [])
+        names = ['%s_%s' % (cont.name, py) for py, _ in slots] + ['new_' + cont.name]
+        code.append('static const char *const qn_%s[] = {%s};' % (cont.name, ', '.join(cstr(n) for n in names)))
+        code.append('static const qr::ContainerInfo qi_%s = {qn_%s, %s, &%s, &%s, &%s, &%s};'
+                    % (cont.name, cont.name, cstr(short), ty_ref(cd), ty_ref(ed), ty_ref(itd), ty_ref(ad)))
+        info = {'cls': cont, 'methods': [], 'statics': [], 'fields': [], 'new': 'new_' + cont.name,
+                'delete': 'delete_' + cont.name, 'container': True}
+        for (py, fn), name in zip(slots + [('new', 'new_')], names):
+            code.append('PyObject *qw_%s(PyObject *, PyObject *args) { return %s::%s(args, qi_%s); }'
+                        % (name, ops, fn, cont.name))
+            self.wrappers.append(Wrapper(name, 'qw_' + name, None, cont))
+            if py != 'new':
+                info['methods'].append(py)
+        code.append('PyObject *qw_delete_%s(PyObject *, PyObject *args) {\n'
+                    '  PyObject *o0; %s *p;\n'
+                    '  if (!PyArg_ParseTuple(args, "O:delete_%s", &o0)) return 0;\n'
+                    '  if (!qr::ArgPtr(o0, (void **)&p, %s, "delete_%s", 1, %s, qr::POINTER_DISOWN | qr::POINTER_DESTROY)) return 0;\n'
+                    '  delete p;\n  return qr::NoneResult();\n}\n'
+                    % (cont.name, t.spell(), cont.name, ty_ref(cd), cont.name, cstr(short + ' *')))
+        self.wrappers.append(Wrapper('delete_' + cont.name, 'qw_delete_' + cont.name, None, cont))
+        code.append('PyObject *qw_%s_swigregister(PyObject *, PyObject *args) { return qr::SwigRegister(args, %s); }\n'
+                    % (cont.name, ty_ref(cd)))
+        self.wrappers.append(Wrapper(cont.name + '_swigregister', 'qw_%s_swigregister' % cont.name, None, cont))
+        self.shadow.append(info)
+
     # -- output -------------------------------------------------------------------
     def generate(self, extends=()):
+        for cont in self.model.containers:
+            self.add_container(cont)
         for cls in self.model.classes:
             self.add_class(cls)
         self.add_free_functions()
@@ -677,7 +742,8 @@ class ModuleGen:
         import os
         os.makedirs(out_dir, exist_ok=True)
         common = ['// Generated by codegen/qorgen.py. Do not edit.',
-                  '#include "qorrt.h"', '#include "varsetters.h"', '#include "seq.h"', '#include <cstring>']
+                  '#include "qorrt.h"', '#include "varsetters.h"', '#include "seq.h"', '#include "container_ops.h"',
+                  '#include <cstring>']
         common += ['#include "%s"' % h for h in includes]
         common += ['#include "%s"' % h for h in support_headers]
         common += ['extern swig_type_info *qt_in_use[];', '#define QT(i) qt_in_use[i]', '']
@@ -733,7 +799,7 @@ class ModuleGen:
         for k, v in self.model.values:
             lines.append('%s %s' % ('constant' if k == 'const' else 'variable', v.pyname))
         ncast = sum(1 + len(d.casts) for d in self.descs)
-        nconv = sum(len(d.casts) for d in self.descs)
+        nconv = sum(1 for d in self.descs for c in d.casts if c[1])
         for d in self.descs:
             lines.append('descriptor %s %s' % (d.mangled, '|'.join(d.humans)))
         summary = ['functions %d' % len(self.wrappers),

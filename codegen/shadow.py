@@ -106,8 +106,30 @@ def write_shadow(gen, path):
         out.append('')
         out.append('')
 
+    for cont in model.containers:
+        info = infos[cont.qname]
+        name = cont.name
+        out.append('class %s(_Object):' % name)
+        out.append('    """%s"""' % cont.qname)
+        out.append('    __swig_destroy__ = %s.delete_%s' % (ext, name))
+        out.append('')
+        out.append('    def __init__(self, *args):')
+        out.append('        self.this = %s.new_%s(*args)' % (ext, name))
+        out.append('')
+        out.append('    def __iter__(self):')
+        out.append('        return self.iterator()')
+        out.append('')
+        out.append('')
+        for m in info['methods']:
+            out.append('%s.%s = _im(%s.%s_%s, %s)' % (name, m, ext, name, m, name))
+        out.append('%s.%s_swigregister(%s)' % (ext, name, name))
+        out.append('')
+        out.append('')
     for cls in model.classes:
         emit(cls)
+        if cls.qname == 'swig::PySwigIterator':
+            # Iterator objects walk like Python iterators.
+            out.insert(len(out) - 2, '%s.__iter__ = lambda self: self' % cls.name)
     # Free functions (and their statics' module-level names).
     for w in gen.wrappers:
         if w.cls is None:
