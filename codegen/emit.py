@@ -288,6 +288,9 @@ class ModuleGen:
     def catch_clauses(self, func):
         out = []
         for exc in sorted(func.throws, key=lambda e: 0 if e.startswith('QorCtl') else 1):
+            if exc == 'swig::stop_iteration':
+                out.append('catch (swig::stop_iteration &) { return qr::RaiseStopIteration(); }')
+                continue
             d = self.table.pointer_to(CType('record', exc))
             out.append('catch (%s &e) { return qr::RaiseLibraryException(new %s(e), %s); }' % (exc, exc, ty_ref(d)))
         for exc, helper in getattr(func, 'std_catches', []):
@@ -782,7 +785,7 @@ class ModuleGen:
         m.append('}\n')
         write_if_changed(os.path.join(out_dir, 'module.cpp'), self.resolve('\n'.join(m)))
 
-    def surface(self):
+    def surface(self, totals={}):
         lines = []
         fam = {'new_': 0, 'delete_': 0, '_swigregister': 0}
         for w in self.wrappers:
@@ -802,13 +805,14 @@ class ModuleGen:
         nconv = sum(1 for d in self.descs for c in d.casts if c[1])
         for d in self.descs:
             lines.append('descriptor %s %s' % (d.mangled, '|'.join(d.humans)))
-        summary = ['functions %d' % len(self.wrappers),
-                   'classes %d' % len(self.model.classes),
-                   'new_ %d' % fam['new_'], 'delete_ %d' % fam['delete_'],
-                   '_swigregister %d' % fam['_swigregister'],
-                   'descriptors %d' % len(self.descs),
-                   'cast entries %d (with converter %d)' % (ncast, nconv),
-                   'constants %d' % nconst, 'variables %d' % nvar]
+        counts = [('functions', len(self.wrappers)),
+                  ('classes', len(self.model.classes) + len(self.model.containers)),
+                  ('new_', fam['new_']), ('delete_', fam['delete_']),
+                  ('_swigregister', fam['_swigregister']), ('descriptors', len(self.descs)),
+                  ('cast entries', ncast), ('casts with converter', nconv),
+                  ('constants', nconst), ('variables', nvar)]
+        # Each count against the complete surface's, where the totals are known.
+        summary = ['%s %d%s' % (k, v, ' of %d' % totals[k] if k in totals else '') for k, v in counts]
         return '\n'.join(['# ' + s for s in summary] + lines) + '\n'
 
 

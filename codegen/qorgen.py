@@ -57,6 +57,7 @@ def main():
     ap.add_argument('--out', required=True)
     ap.add_argument('--shadow', required=True)
     ap.add_argument('--surface')
+    ap.add_argument('--totals', help='file of "<count name> <number>" lines: the complete surface')
     ap.add_argument('--chunks', type=int, default=4)
     ap.add_argument('-I', dest='incdirs', action='append', default=[], help='further include directories')
     args = ap.parse_args()
@@ -79,7 +80,14 @@ def main():
     os.makedirs(os.path.dirname(os.path.abspath(args.shadow)), exist_ok=True)
     write_shadow(gen, args.shadow)
     if args.surface:
-        write_if_changed(args.surface, gen.surface())
+        totals = {}
+        if args.totals:
+            for line in open(args.totals):
+                line = line.split('#', 1)[0].strip()
+                if line:
+                    k, v = line.rsplit(None, 1)
+                    totals[k] = int(v)
+        write_if_changed(args.surface, gen.surface(totals))
 
 
 if __name__ == '__main__':
