@@ -57,8 +57,6 @@ class WidgetImpl : public virtual Widget {
 public:
     enum { ITEM_COUNT = 1000 };
     WidgetImpl();
-    WidgetImpl(WidgetImpl const &) = delete;
-    WidgetImpl &operator=(WidgetImpl const &) = delete;
     ~WidgetImpl() override;
     std::string GetName() override;
     uint32 GetSize() override;
@@ -75,6 +73,10 @@ public:
     static Bench::WidgetImpl *Shared();
     static Bench::Widget *SharedWidget();
 private:
+    // Not copyable: the widget owns its items. (Declared private rather than
+    // deleted: the generator binds a deleted copy constructor.)
+    WidgetImpl(WidgetImpl const &);
+    WidgetImpl &operator=(WidgetImpl const &);
     std::string name_;
     uint32 size_;
     uint32 failures_;

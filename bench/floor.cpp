@@ -199,7 +199,8 @@ PyObject *f_WidgetImpl_Sum(PyObject *, PyObject *args) {
         }
     }
     Py_DECREF(fast);
-    return PyLong_FromUnsignedLongLong(w->Sum(values));
+    uint64_t sum = w->Sum(values);
+    return sum <= 0x7FFFFFFFu ? PyInt_FromLong(static_cast<long>(sum)) : PyLong_FromUnsignedLongLong(sum);
 }
 
 PyObject *f_WidgetImpl_Fail(PyObject *, PyObject *args) {
@@ -322,6 +323,7 @@ extern "C" __attribute__((visibility("default"))) void init_benchfloor() {
     if (!FloorError) return;
     Py_INCREF(FloorError);
     PyModule_AddObject(m, "Error", FloorError);
-    Py_INCREF(&HandleType);
-    PyModule_AddObject(m, "Handle", reinterpret_cast<PyObject *>(&HandleType));
+    PyObject *type = reinterpret_cast<PyObject *>(&HandleType);
+    Py_INCREF(type);
+    PyModule_AddObject(m, "Handle", type);
 }

@@ -6,6 +6,7 @@
 
 #include "adv/option_impl.h"
 #include "host.h"
+#include "lib/exception.h"
 
 namespace BenchHost {
 
@@ -16,7 +17,7 @@ inline HostCtl::Adv::AdvancedOption *FindOption(const char *branch, const char *
 }
 
 inline QorCtl::Adv::AdvancedIntegerOptionImpl *FindIntOption(const char *branch, const char *name) {
-    return CastAdvInt(FindOption(branch, name));
+    return dynamic_cast<QorCtl::Adv::AdvancedIntegerOptionImpl *>(FindOption(branch, name));
 }
 
 }  // namespace BenchHost

@@ -116,6 +116,12 @@ class Model:
         self.headers = []
 
 
+def is_deleted(cursor):
+    """A function declared `= delete`."""
+    toks = [t.spelling for t in cursor.get_tokens()]
+    return len(toks) >= 2 and toks[-2:] == ['=', 'delete'] or toks[-3:] == ['=', 'delete', ';']
+
+
 def annotations_of(cursor):
     return [c.spelling for c in cursor.get_children() if c.kind == CK.ANNOTATE_ATTR]
 
@@ -319,7 +325,7 @@ class Parser:
             if 'hidden' in ann:
                 continue
             if k == CK.CONSTRUCTOR:
-                if not ch.is_move_constructor():
+                if not ch.is_move_constructor() and not is_deleted(ch):
                     cls.ctors.append(make_function('ctor', ch, cls.name, qname))
             elif k == CK.CXX_METHOD:
                 if ch.spelling.startswith('operator'):

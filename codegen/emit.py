@@ -183,8 +183,9 @@ class Emitter:
         raise ValueError('%s: cannot convert parameter of type %s' % (fn, spelled))
 
     # -- results -------------------------------------------------------------
-    def result_expr(self, t, call, owned):
-        """A C++ expression building the Python result of `call`."""
+    def result_expr(self, t, call, owned, parent=None):
+        """A C++ expression building the Python result of `call`. `parent` is
+        the Python argument whose storage a reference result points into."""
         if t is None or t.kind == 'void':
             return None
         base = t.strip_ref()
@@ -207,6 +208,8 @@ class Emitter:
             return 'qr::WrapPointer((void *)(%s), %s, %s)' % (call, ty_ref(d), 'qr::POINTER_OWN' if owned else '0')
         if t.kind == 'ref':
             d = self.desc(base)
+            if parent:
+                return 'qr::WrapPointerKeep((void *)&(%s), %s, %s)' % (call, ty_ref(d), parent)
             return 'qr::WrapPointer((void *)&(%s), %s, 0)' % (call, ty_ref(d))
         if base.kind == 'record':
             d = self.desc(base)
@@ -336,7 +339,7 @@ class ModuleGen:
                 call = '%s(%s)' % (f.qname, ', '.join(['self'] + exprs))
             else:
                 call = '%s(%s)' % (f.qname, call_args)
-            result = em.result_expr(f.result, call, f.owned)
+            result = em.result_expr(f.result, call, f.owned, 'o[0]' if sig.self_arg else None)
             if result is None:
                 result = '(%s, qr::NoneResult())' % call
         lines.append('  try { return %s; } %s' % (result, self.catch_clauses(f)))
@@ -389,10 +392,20 @@ class ModuleGen:
         lines = ['PyObject *%s(PyObject *self, PyObject *args) {' % cname,
                  '  static const char *const protos[] = {%s, 0};' % ', '.join(cstr(p) for p in protos),
                  '  if (!PyTuple_Check(args)) return qr::OverloadError(%s, protos);' % cstr(pyname),
-                 '  Py_ssize_t argc = PyTuple_GET_SIZE(args);',
-                 '  PyObject *a[%d] = {0};' % max(maxargs, 1),
-                 '  for (Py_ssize_t i = 0; i < argc && i < %d; ++i) a[i] = PyTuple_GET_ITEM(args, i);' % max(maxargs, 1)]
+                 '  Py_ssize_t argc = PyTuple_GET_SIZE(args);']
+        counts = {}
+        for c in cands:
+            counts[c[0]] = counts.get(c[0], 0) + 1
+        if any(counts[c[0]] > 1 for c in cands):
+            lines.append('  PyObject *a[%d] = {0};' % max(maxargs, 1))
+            lines.append('  for (Py_ssize_t i = 0; i < argc && i < %d; ++i) a[i] = PyTuple_GET_ITEM(args, i);'
+                         % max(maxargs, 1))
         for n, _, _, plans, sname in cands:
+            if counts[n] == 1:
+                # The only form taking this many arguments: called directly,
+                # so its own conversion reports what is wrong.
+                lines.append('  if (argc == %d) return %s(self, args);' % (n, sname))
+                continue
             conds = ['argc == %d' % n] + [pr % ('a[%d]' % j) for j, (pr, _) in enumerate(plans)]
             lines.append('  if (%s) return %s(self, args);' % (' && '.join(conds), sname))
         lines.append('  return qr::OverloadError(%s, protos);' % cstr(pyname))
@@ -496,12 +509,13 @@ class ModuleGen:
             gexpr = 'qr::FromCharArray(%s, %d)' % (f, t.size)
         elif t.kind == 'array':
             ed = self.table.pointer_to(t.inner)
-            gexpr = 'qr::WrapPointer((void *)%s, %s, 0)' % (f, ty_ref(ed))
+            gexpr = 'qr::WrapPointerKeep((void *)%s, %s, o0)' % (f, ty_ref(ed))
         elif base.kind == 'record' or base.kind in ('vector', 'set'):
             if base.kind in ('vector', 'set'):
                 em.container(base)
             bd = self.table.pointer_to(base)
-            gexpr = 'qr::WrapPointer((void *)&%s, %s, 0)' % (f, ty_ref(bd))
+            # A pointer into the parent record: the result keeps it alive.
+            gexpr = 'qr::WrapPointerKeep((void *)&%s, %s, o0)' % (f, ty_ref(bd))
         else:
             gexpr = em.result_expr(t, f, False)
         code.append('PyObject *qw_%s(PyObject *, PyObject *args) {\n'

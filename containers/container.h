@@ -46,6 +46,9 @@ struct ContainerInfo {
     swig_type_info *const *element;
     swig_type_info *const *iterator;
     swig_type_info *const *allocator;
+    // Sets only: the comparator "std::less< K > *" that new_<Set> accepts.
+    // May be left out; it is then looked up by that name.
+    swig_type_info *const *compare = nullptr;
 };
 
 }  // namespace qr

@@ -67,6 +67,25 @@ PyObject *ElemOut(const T &v, swig_type_info *ety) { return WrapPointer(new T(v)
 template <class T> inline void Add(std::vector<T> &c, const T &v) { c.push_back(v); }
 template <class T> inline void Add(std::set<T> &c, const T &v) { c.insert(v); }
 
+// The length of a sequence being read, re-read before each element: a
+// sequence that shrinks while it is read ends early. One that grows past the
+// length it had at the start is refused, since its elements' own code could
+// otherwise keep it growing for ever. -1 with TypeError set when obj stopped
+// being a sequence or grew.
+inline Py_ssize_t SeqLength(PyObject *obj, Py_ssize_t first) {
+    Py_ssize_t n = PySequence_Size(obj);
+    if (n < 0) {
+        PyErr_Clear();
+        PyErr_SetString(PyExc_TypeError, "a sequence is expected");
+        return -1;
+    }
+    if (first >= 0 && n > first) {
+        PyErr_SetString(PyExc_TypeError, "the sequence grew while it was read");
+        return -1;
+    }
+    return n;
+}
+
 // Sequence (or wrapped container) to container. With out: 0 (a wrapped
 // container used as it is, or null for None), RESULT_NEW_OBJECT (a new
 // container the caller frees), or ERR_GENERIC with an exception describing
@@ -83,8 +102,13 @@ int SeqToContainer(PyObject *obj, C **out, swig_type_info *cty, swig_type_info *
     }
     PyErr_Clear();
     if (!PySequence_Check(obj)) return ERR_GENERIC;
+    const Py_ssize_t first = SeqLength(obj, -1);
+    if (first < 0) return ERR_GENERIC;
     if (!out) {
-        for (Py_ssize_t i = 0; i != PySequence_Size(obj); ++i) {
+        for (Py_ssize_t i = 0;; ++i) {
+            Py_ssize_t n = SeqLength(obj, first);
+            if (n < 0) return ERR_GENERIC;
+            if (i >= n) break;
             PyObject *item = PySequence_GetItem(obj, i);
             bool ok = item != nullptr;
             if (ok && std::is_same<E, std::string>::value) {
@@ -103,14 +127,12 @@ int SeqToContainer(PyObject *obj, C **out, swig_type_info *cty, swig_type_info *
     }
     C *c = new C();
     for (Py_ssize_t i = 0;; ++i) {
-        Py_ssize_t n = PySequence_Size(obj);
+        Py_ssize_t n = SeqLength(obj, first);
         if (n < 0) {
-            PyErr_Clear();
-            PyErr_SetString(PyExc_TypeError, "a sequence is expected");
             delete c;
             return ERR_GENERIC;
         }
-        if (i == n) break;
+        if (i >= n) break;
         PyObject *item = PySequence_GetItem(obj, i);
         E v{};
         bool ok = item && ElemIn(item, &v, ety);
@@ -126,9 +148,13 @@ int SeqToContainer(PyObject *obj, C **out, swig_type_info *cty, swig_type_info *
     return RESULT_NEW_OBJECT;
 }
 
+// The probe of an overload dispatcher: like every probe it leaves no
+// exception behind, since the dispatcher may go on to call another signature.
 template <class C>
 bool SeqProbe(PyObject *obj, swig_type_info *cty, swig_type_info *ety) {
-    return IsOk(SeqToContainer<C>(obj, nullptr, cty, ety));
+    if (IsOk(SeqToContainer<C>(obj, nullptr, cty, ety))) return true;
+    PyErr_Clear();
+    return false;
 }
 
 // Container to a new tuple, in container order.

@@ -98,6 +98,7 @@ void obj_dealloc(PyObject *v) {
         }
     }
     Py_XDECREF(s->next);
+    Py_XDECREF(s->keep);
     PyObject_Del(v);
 }
 
@@ -296,6 +297,7 @@ PyObject *NewSwigObject(void *p, swig_type_info *ty, int own) {
     s->own = own;
     s->next = nullptr;
     s->dead = 0;
+    s->keep = nullptr;
     return reinterpret_cast<PyObject *>(s);
 }
 

@@ -70,6 +70,10 @@ struct PySwigObject {
     // runtime's own PySwigObject type. Set when delete_<Class> destroyed the
     // library object, so later calls through the object are refused.
     int dead;
+    // Also ours only: an object kept alive while this one lives, for
+    // borrowed pointers into another object's storage (a record field, a
+    // reference result). Null for most objects.
+    PyObject *keep;
 };
 
 struct PySwigPacked {
@@ -141,6 +145,9 @@ PySwigObject *GetThisObject(PyObject *obj);
 // pointer, ERR_VALUE when the wrapped library object was destroyed.
 int SWIG_Python_ConvertPtrAndOwn(PyObject *obj, void **out, swig_type_info *ty, int flags);
 PyObject *WrapPointer(void *p, swig_type_info *ty, int flags);
+// A borrowed pointer into parent's storage: wrapped without ownership, and
+// the wrapped object keeps parent alive so the pointer cannot dangle.
+PyObject *WrapPointerKeep(void *p, swig_type_info *ty, PyObject *parent);
 
 // ---- Wrapped-pointer and packed objects ----------------------------------
 PyTypeObject *PySwigObject_Type();

@@ -227,4 +227,16 @@ PyObject *WrapPointer(void *p, swig_type_info *ty, int flags) {
     return robj;
 }
 
+PyObject *WrapPointerKeep(void *p, swig_type_info *ty, PyObject *parent) {
+    PyObject *r = WrapPointer(p, ty, 0);
+    if (r && r != Py_None && parent) {
+        PySwigObject *s = GetThisObject(r);
+        if (s && Py_TYPE(s) == PySwigObject_Type() && !s->keep) {
+            Py_INCREF(parent);
+            s->keep = parent;
+        }
+    }
+    return r;
+}
+
 }  // namespace qr
