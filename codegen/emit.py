@@ -310,8 +310,11 @@ class ModuleGen:
         if nargs:
             lines.append('  PyObject *o[%d];' % nargs)
             fmt = 'O' * nargs + ':' + wname
-            lines.append('  if (!PyArg_ParseTuple(args, %s, %s)) return 0;'
-                         % (cstr(fmt), ', '.join('&o[%d]' % i for i in range(nargs))))
+            if nargs > 8:
+                lines.append('  if (!PyArg_ParseTuple(args, %s, %s)) return 0;'
+                             % (cstr(fmt), ', '.join('&o[%d]' % i for i in range(nargs))))
+            else:
+                lines.append('  if (!qr::Unpack(args, %s, %d, o)) return 0;' % (cstr(fmt), nargs))
         else:
             lines.append('  if (!PyArg_ParseTuple(args, %s)) return 0;' % cstr(':' + wname))
         i = 0

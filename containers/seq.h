@@ -94,7 +94,9 @@ inline Py_ssize_t SeqLength(PyObject *obj, Py_ssize_t first) {
 template <class C>
 int SeqToContainer(PyObject *obj, C **out, swig_type_info *cty, swig_type_info *ety) {
     typedef typename C::value_type E;
-    if (obj == Py_None || GetThisObject(obj)) {
+    // Plain lists and tuples carry no wrapped pointer: skip the lookup.
+    bool plain = PyList_CheckExact(obj) || PyTuple_CheckExact(obj);
+    if (!plain && (obj == Py_None || GetThisObject(obj))) {
         void *p = nullptr;
         if (SWIG_Python_ConvertPtrAndOwn(obj, out ? &p : nullptr, cty, 0) != 0) return ERR_GENERIC;
         if (out) *out = static_cast<C *>(p);

@@ -2,6 +2,7 @@
 // protocol's messages, overload probes and exception translation.
 #include "qrinternal.h"
 
+#include <cstring>
 #include <exception>
 #include <string>
 
@@ -49,6 +50,30 @@ PyObject *OverloadError(const char *fn, const char *const *prototypes) {
 }
 
 // ---- Class arguments --------------------------------------------------------
+
+bool Unpack(PyObject *args, const char *format, Py_ssize_t n, PyObject **o) {
+    if (PyTuple_Check(args) && PyTuple_GET_SIZE(args) == n) {
+        for (Py_ssize_t i = 0; i < n; ++i) o[i] = PyTuple_GET_ITEM(args, i);
+        return true;
+    }
+    // The wrong count: the interpreter's own parse gives its usual message.
+    switch (n) {
+    case 0: return PyArg_ParseTuple(args, format);
+    case 1: return PyArg_ParseTuple(args, format, &o[0]);
+    case 2: return PyArg_ParseTuple(args, format, &o[0], &o[1]);
+    case 3: return PyArg_ParseTuple(args, format, &o[0], &o[1], &o[2]);
+    case 4: return PyArg_ParseTuple(args, format, &o[0], &o[1], &o[2], &o[3]);
+    case 5: return PyArg_ParseTuple(args, format, &o[0], &o[1], &o[2], &o[3], &o[4]);
+    case 6: return PyArg_ParseTuple(args, format, &o[0], &o[1], &o[2], &o[3], &o[4], &o[5]);
+    case 7: return PyArg_ParseTuple(args, format, &o[0], &o[1], &o[2], &o[3], &o[4], &o[5], &o[6]);
+    case 8: return PyArg_ParseTuple(args, format, &o[0], &o[1], &o[2], &o[3], &o[4], &o[5], &o[6], &o[7]);
+    default:
+        PyErr_Format(PyExc_TypeError, "%s takes exactly %d arguments (%d given)",
+                     std::strchr(format, ':') ? std::strchr(format, ':') + 1 : format, (int)n,
+                     PyTuple_Check(args) ? (int)PyTuple_GET_SIZE(args) : 0);
+        return false;
+    }
+}
 
 bool ArgSelf(PyObject *obj, void **out, swig_type_info *ty, const char *fn, const char *type) {
     return ArgRef(obj, out, ty, fn, 1, type);

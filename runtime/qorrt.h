@@ -221,6 +221,11 @@ PyObject *FromCharArray(const char *p, size_t n);
 PyObject *NoneResult();
 
 // ---- Wrapper protocol -----------------------------------------------------
+// Unpacks exactly n objects from the argument tuple into o. The format is the
+// wrapper's PyArg_ParseTuple format ("OO:name"), used for the interpreter's
+// own message when the count is wrong.
+bool Unpack(PyObject *args, const char *format, Py_ssize_t n, PyObject **o);
+
 // Message patterns.
 PyObject *ArgError(int code, const char *fn, int argn, const char *type);
 PyObject *NullRefError(const char *fn, int argn, const char *type);

@@ -68,7 +68,18 @@ bool IsDead(const PySwigObject *s) {
 PyObject *NewShadow(swig_class_data *data, PyObject *robj) {
     PyObject *inst = nullptr;
     if (data->newraw) {
-        inst = PyObject_Call(data->newraw, data->newargs, nullptr);
+        PyObject *self = PyCFunction_Check(data->newraw) ? PyCFunction_GET_SELF(data->newraw) : nullptr;
+        if (self && PyType_Check(self) && PyTuple_Check(data->newargs) && PyTuple_GET_SIZE(data->newargs) == 1 &&
+            PyType_Check(PyTuple_GET_ITEM(data->newargs, 0))) {
+            // The class keeps a built-in __new__: call the defining type's
+            // allocation slot directly, as __new__(cls) would, without a
+            // Python-level call per wrapped result.
+            static PyObject *empty = PyTuple_New(0);
+            PyTypeObject *cls = reinterpret_cast<PyTypeObject *>(PyTuple_GET_ITEM(data->newargs, 0));
+            inst = empty ? reinterpret_cast<PyTypeObject *>(self)->tp_new(cls, empty, nullptr) : nullptr;
+        } else {
+            inst = PyObject_Call(data->newraw, data->newargs, nullptr);
+        }
         if (inst) {
             PyObject **dictptr = _PyObject_GetDictPtr(inst);
             if (dictptr) {
