@@ -240,7 +240,9 @@ class Parser:
         for c in tu.cursor.get_children():
             self._collect(c, wanted, by_file)
         for h in self.headers:
-            for c in by_file.get(os.path.realpath(h), []):
+            # Macros are listed apart from declarations: restore source order.
+            decls = sorted(by_file.get(os.path.realpath(h), []), key=lambda c: c.extent.start.offset)
+            for c in decls:
                 self._decl(c, '')
         return self.model
 

@@ -591,13 +591,24 @@ class ModuleGen:
             g, s = self.var_functions(v)
             funcs.append(g)
             funcs.append(s)
-            if v.owner is not None and v.ctype.unconst().kind in ('array', 'record'):
+            if v.owner is not None and self.has_static_accessors(v):
                 funcs.append(self.static_accessors(v))
             init.append('  qr::AddGlobalVariable(qr::GlobalVarLink(), %s, qv_get_%s, qv_set_%s);'
                         % (cstr(v.pyname), v.pyname, v.pyname))
         if not cvar_done:
             init.append('  PyDict_SetItemString(d, "cvar", qr::GlobalVarLink());')
         return funcs, init
+
+    @staticmethod
+    def has_static_accessors(v):
+        """Writable static members of array and record type also get
+        functions in the method table; constant ones do not."""
+        t = v.ctype
+        if t.const:
+            return False
+        if t.kind == 'array':
+            return not t.inner.const
+        return t.kind == 'record'
 
     def static_accessors(self, v):
         """<Class>_<member>_get / _set in the method table, for static members

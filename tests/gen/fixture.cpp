@@ -59,7 +59,9 @@ std::string Square::Pick(std::string const &text) { return "text:" + text; }
 std::string Square::Pick(uint32 n) { return "number:" + std::to_string(n); }
 Colour Square::Paint(Colour c) { return c == RED ? BLUE : RED; }
 int64 Square::Shift(int64 v, uint8 bits, uint16 mask, char tag, Bool flag) {
-    return ((v << bits) & mask) + tag + flag;
+    // Shifted as unsigned: every bit pattern and width is defined.
+    uint64 shifted = bits < 64 ? static_cast<uint64>(v) << bits : 0;
+    return static_cast<int64>(shifted & mask) + tag + flag;
 }
 bool Square::operator==(Square const &other) const { return side_ == other.side_; }
 

@@ -195,7 +195,7 @@ def sweep_function(module, name, pool, guard, journal, start):
     inf = surface.Inferrer(pool, guard)
     journal.write("I", name)
     sigs = inf.infer(name, fn) if guard.may_call(name) else _delete_sigs(inf, name, fn, pool)
-    journal.write("N", inf.calls, int(all(s.complete for s in sigs)))
+    journal.write("N", inf.calls, int(start == 0 and all(s.complete for s in sigs)))
     battery = Battery(name, sigs, pool, guard)
     for i, (label, build) in enumerate(battery.entries):
         if i < start:
