@@ -140,8 +140,17 @@ def default_text(parm):
 def make_function(kind, c, name, qname):
     params = []
     for p in c.get_arguments():
-        params.append(Param(p.spelling, build(p.type), default_text(p)))
+        t = build(p.type)
+        for a in annotations_of(p):
+            if a.startswith('name:'):
+                # The library names this parameter's type otherwise: a
+                # descriptor of its own, without casts to the class.
+                t = t.aliased(a.split(':', 1)[1])
+        params.append(Param(p.spelling, t, default_text(p)))
     result = build(c.result_type) if kind != 'ctor' else None
+    for a in annotations_of(c):
+        if a.startswith('result-name:') and result is not None:
+            result = result.aliased(a.split(':', 1)[1])
     return Function(kind, name, qname, result, params, annotations_of(c),
                     const=c.is_const_method() if c.kind == CK.CXX_METHOD else False,
                     static=c.is_static_method() if c.kind == CK.CXX_METHOD else False,

@@ -71,20 +71,32 @@ class CType:
         self.size = size          # array length
         self.canon = canon        # canonical clang kind of a scalar
         self.args = list(args)    # template arguments
+        self.alias = None         # the name messages and descriptors use, when
+                                  # the library names the type otherwise
 
     # -- spelling --------------------------------------------------------
-    def spell(self):
+    def cxx(self):
+        """The type as C++ code names it (aliases resolved)."""
+        return self.spell(real=True)
+
+    def spell(self, real=False):
+        if not real and self.alias:
+            s = self.alias
+            if self.const:
+                s += ' const'
+            return s
+        inner_spell = (lambda t: t.spell(real)) if real else (lambda t: t.spell())
         if self.kind == 'pointer':
-            s = self.inner.spell() + ' *'
+            s = inner_spell(self.inner) + ' *'
         elif self.kind == 'ref':
-            s = self.inner.spell() + ' &'
+            s = inner_spell(self.inner) + ' &'
         elif self.kind == 'array':
-            s = '%s [%s]' % (self.inner.spell(), self.size if self.size is not None else '')
+            s = '%s [%s]' % (inner_spell(self.inner), self.size if self.size is not None else '')
         elif self.kind == 'vector':
-            e = self.args[0].spell()
+            e = inner_spell(self.args[0])
             s = 'std::vector< %s,std::allocator< %s > >' % (e, e)
         elif self.kind == 'set':
-            e = self.args[0].spell()
+            e = inner_spell(self.args[0])
             s = 'std::set< %s,std::less< %s >,std::allocator< %s > >' % (e, e, e)
         else:
             s = self.name
@@ -101,6 +113,8 @@ class CType:
         if self.kind == 'array':
             return 'a_%s__%s' % (self.size, self.inner.mangle())
         pre = 'q_const__' if self.const else ''
+        if self.alias:
+            return pre + mangle_name(self.alias)
         if self.kind in ('vector', 'set'):
             e = self.args[0].mangle()
             if self.kind == 'vector':
@@ -112,6 +126,18 @@ class CType:
 
     def unconst(self):
         c = CType(self.kind, self.name, self.inner, False, self.size, self.canon, self.args)
+        c.alias = self.alias
+        return c
+
+    def aliased(self, name):
+        """This type with its named base type called `name` in messages and
+        descriptors (a pointer, reference or const around it kept)."""
+        if self.kind in ('pointer', 'ref'):
+            c = CType(self.kind, self.name, self.inner.aliased(name), self.const, self.size, self.canon, self.args)
+            return c
+        c = self.unconst()
+        c.const = self.const
+        c.alias = name
         return c
 
     # -- classification --------------------------------------------------

@@ -161,7 +161,7 @@ class Emitter:
             ct = self.container(base)
             d = self.desc(ct)
             ed = self.elem_desc(ct)
-            cname = ct.spell()
+            cname = ct.cxx()
             decl = ('qr::SeqArg< %s > %s; if (!%s.Convert(%s, %s, %s, F, %d, %s)) return 0;'
                     % (cname, a, a, o, ty_ref(d), ty_ref(ed), n, cstr(spelled)))
             return ArgPlan(decl, '%s.get()' % a, 'qr::SeqProbe< %s >(%%s, %s, %s)' % (cname, ty_ref(d), ty_ref(ed)),
@@ -170,13 +170,13 @@ class Emitter:
             # An array parameter is passed as a pointer to its first element.
             inner = t.inner
             d = self.desc(inner)
-            ctyp = inner.unconst().spell()
+            ctyp = inner.unconst().cxx()
             decl = '%s *%s; if (!qr::ArgPtr(%s, (void **)&%s, %s, F, %d, %s)) return 0;' % (
                 ctyp, a, o, a, ty_ref(d), n, cstr(spelled))
             return ArgPlan(decl, a, 'qr::ProbePtr(%%s, %s)' % ty_ref(d), RANK_POINTER, 'pointer')
         if base.kind in ('record', 'string', 'scalar', 'enum') or t.kind == 'ref':
             d = self.desc(base)
-            ctyp = base.unconst().spell()
+            ctyp = base.unconst().cxx()
             decl = '%s *%s; if (!qr::ArgRef(%s, (void **)&%s, %s, F, %d, %s)) return 0;' % (
                 ctyp, a, o, a, ty_ref(d), n, cstr(spelled))
             return ArgPlan(decl, '*' + a, 'qr::ProbePtr(%%s, %s)' % ty_ref(d), RANK_POINTER, 'record')
@@ -200,9 +200,12 @@ class Emitter:
             return 'qr::FromStdString(%s)' % call
         if t.kind == 'pointer' and is_char(t.inner):
             return 'qr::FromCString(%s)' % call
+        if t.kind == 'pointer' and t.inner.name == 'PyObject':
+            # Already a Python object: a new reference, or null with an error.
+            return call
         if base.kind in ('vector', 'set'):
             ct = self.container(base)
-            return 'qr::SeqOut< %s >(%s, %s)' % (ct.spell(), call, ty_ref(self.elem_desc(ct)))
+            return 'qr::SeqOut< %s >(%s, %s)' % (ct.cxx(), call, ty_ref(self.elem_desc(ct)))
         if t.kind == 'pointer':
             d = self.desc(t.inner)
             return 'qr::WrapPointer((void *)(%s), %s, %s)' % (call, ty_ref(d), 'qr::POINTER_OWN' if owned else '0')
@@ -213,7 +216,7 @@ class Emitter:
             return 'qr::WrapPointer((void *)&(%s), %s, 0)' % (call, ty_ref(d))
         if base.kind == 'record':
             d = self.desc(base)
-            return 'qr::WrapPointer(new %s(%s), %s, qr::POINTER_OWN)' % (base.unconst().spell(), call, ty_ref(d))
+            return 'qr::WrapPointer(new %s(%s), %s, qr::POINTER_OWN)' % (base.unconst().cxx(), call, ty_ref(d))
         raise ValueError('cannot convert result of type %s' % t.spell())
 
 
@@ -239,7 +242,7 @@ class Sig:
         if f.kind == 'ctor':
             return '%s(%s)' % (self.cls.qname, ','.join(types))
         if self.self_arg:
-            return '%s(%s)' % (f.name, ','.join([self.self_type().spell()] + types))
+            return '%s(%s)' % (f.pyname or f.name, ','.join([self.self_type().spell()] + types))
         return '%s(%s)' % (f.qname, ','.join(types))
 
 
@@ -321,8 +324,14 @@ class ModuleGen:
         if sig.self_arg:
             st = sig.self_type()
             d = self.table.pointer_to(st.inner)
-            lines.append('  %s *self; if (!qr::ArgSelf(o[0], (void **)&self, %s, F, %s)) return 0;'
-                         % (sig.cls.qname, ty_ref(d), cstr(st.spell())))
+            if 'self-disown' in f.annotations:
+                # The result takes over the object: the argument stops owning it.
+                lines.append('  %s *self; if (!qr::ArgPtr(o[0], (void **)&self, %s, F, 1, %s, qr::POINTER_DISOWN)) return 0;'
+                             % (sig.cls.qname, ty_ref(d), cstr(st.spell())))
+                lines.append('  if (!self) return qr::NullRefError(F, 1, %s);' % cstr(st.spell()))
+            else:
+                lines.append('  %s *self; if (!qr::ArgSelf(o[0], (void **)&self, %s, F, %s)) return 0;'
+                             % (sig.cls.qname, ty_ref(d), cstr(st.spell())))
             i = 1
         exprs = []
         for p in sig.params:
@@ -533,7 +542,7 @@ class ModuleGen:
                         '  if (self) memcpy(%s, v, %d);\n' % (t.size, t.size, spelled, f, t.size))
             elif t.kind == 'array':
                 ed = self.table.pointer_to(t.inner)
-                ety = t.inner.unconst().spell()
+                ety = t.inner.unconst().cxx()
                 conv = ('  %s *v; if (!qr::ArgPtr(o1, (void **)&v, %s, F, 2, %s)) return 0;\n'
                         '  if (!v) return qr::NullVarError(%s, %s);\n'
                         '  if (self) for (size_t i = 0; i < %d; ++i) %s[i] = v[i];\n'
@@ -542,7 +551,7 @@ class ModuleGen:
                 bd = self.table.pointer_to(base)
                 conv = ('  %s *v; if (!qr::ArgPtr(o1, (void **)&v, %s, F, 2, %s)) return 0;\n'
                         '  if (!v) return qr::NullRefError(F, 2, %s);\n'
-                        '  if (self) %s = *v;\n' % (base.unconst().spell(), ty_ref(bd), cstr(base.spell() + ' *'),
+                        '  if (self) %s = *v;\n' % (base.unconst().cxx(), ty_ref(bd), cstr(base.spell() + ' *'),
                                                     cstr(base.spell() + ' *'), f))
             else:
                 if base.kind == 'string':
@@ -659,7 +668,7 @@ class ModuleGen:
             else:
                 s = ('static int qv_set_%s(PyObject *value) { void *p; if (!qr::VarRecord(value, &p, %s, %s, %s)) return 1;\n'
                      '  %s = *(%s *)p; return 0; }\n' % (name, ty_ref(d), cstr(v.qname), cstr(base.spell()),
-                                                          v.qname, base.spell()))
+                                                          v.qname, base.cxx()))
             return g, s
         if t.kind == 'pointer' and is_char(t.inner):
             g = getter % ('qr::FromCString(%s)' % v.qname)
@@ -716,7 +725,7 @@ class ModuleGen:
         e = t.args[0]
         is_set = t.kind == 'set'
         slots = SET_SLOTS if is_set else VECTOR_SLOTS
-        ops = 'qr::SetOps< %s >' % t.spell() if is_set else 'qr::VectorOps< %s >' % t.spell()
+        ops = 'qr::SetOps< %s >' % t.cxx() if is_set else 'qr::VectorOps< %s >' % t.cxx()
         short = '%s< %s >' % ('std::set' if is_set else 'std::vector', e.spell())
         alloc = CType('record', 'std::allocator< %s >' % e.spell())
         ad = self.table.pointer_to(alloc)
@@ -731,8 +740,12 @@ class ModuleGen:
         code = self.chunks.setdefault(cont.qname, [])
         names = ['%s_%s' % (cont.name, py) for py, _ in slots] + ['new_' + cont.name]
         code.append('static const char *const qn_%s[] = {%s};' % (cont.name, ', '.join(cstr(n) for n in names)))
-        code.append('static const qr::ContainerInfo qi_%s = {qn_%s, %s, &%s, &%s, &%s, &%s};'
-                    % (cont.name, cont.name, cstr(short), ty_ref(cd), ty_ref(ed), ty_ref(itd), ty_ref(ad)))
+        extra = ''
+        if is_set:
+            cmp_d = self.table.pointer_to(CType('record', 'std::less< %s >' % e.spell()))
+            extra = ', &%s' % ty_ref(cmp_d)
+        code.append('static const qr::ContainerInfo qi_%s = {qn_%s, %s, &%s, &%s, &%s, &%s%s};'
+                    % (cont.name, cont.name, cstr(short), ty_ref(cd), ty_ref(ed), ty_ref(itd), ty_ref(ad), extra))
         info = {'cls': cont, 'methods': [], 'statics': [], 'fields': [], 'new': 'new_' + cont.name,
                 'delete': 'delete_' + cont.name, 'container': True}
         for (py, fn), name in zip(slots + [('new', 'new_')], names):

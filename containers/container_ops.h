@@ -4,5 +4,8 @@
 #define QORCTL_CONTAINERS_CONTAINER_OPS_H
 
 #include "container.h"
+#include "iterator.h"
+#include "set_ops.h"
+#include "vector_ops.h"
 
 #endif

@@ -23,21 +23,57 @@ inline swig_type_info *Desc(swig_type_info *const *slot) { return slot ? *slot :
 // ---- names ---------------------------------------------------------------
 
 // ci.spelled followed by suffix: "std::vector< uint32 >" + "::size_type".
-inline std::string Ty(const ContainerInfo &ci, const char *suffix) { return std::string(ci.spelled) + suffix; }
+std::string TypeText(const ContainerInfo &ci, const char *suffix);
 // The container's type with its default arguments spelled out, as library
 // parameters declare it: "std::vector< uint32,std::allocator< uint32 > >".
 std::string FullSpelling(const char *spelled);
 // The element type inside "std::vector< E >" / "std::set< E >".
 std::string ElementSpelling(const char *spelled);
 
+// ---- arguments ---------------------------------------------------------------
+//
+// Each returns false with the protocol's Python exception set.
+
 // Unpacks exactly n objects with the format "O..O:<fn>" (n <= 4).
 bool Parse(PyObject *args, const char *fn, int n, PyObject **o);
+// Unpacks the n arguments of method `slot` and converts argument 1, the
+// container ('<spelled> *'; None is refused).
+bool Enter(PyObject *args, const ContainerInfo &ci, int slot, int n, PyObject **o, void **self);
+// An index ('<spelled>::difference_type', signed 32-bit).
+bool IndexArg(PyObject *o, int32_t *i, const ContainerInfo &ci, const char *fn, int argn);
+// A count ('<spelled>::size_type', uint32).
+bool CountArg(PyObject *o, uint32_t *n, const ContainerInfo &ci, const char *fn, int argn);
+// Another container of the same class, by reference (suffix " &" or
+// " const &"); None is the invalid-null-reference error.
+bool ContainerRefArg(PyObject *o, void **out, const ContainerInfo &ci, const char *fn, int argn, const char *suffix);
+// An iterator object (any iterator type), or null with *code set. Refused
+// when ci has no iterator descriptor.
+swig::PySwigIterator *IteratorObject(PyObject *o, const ContainerInfo &ci, int *code);
+// The TypeError of an iterator argument of the wrong kind:
+// '<spelled>::iterator'.
+void IteratorTypeError(const ContainerInfo &ci, const char *fn, int argn, int code);
+
+// Sets only: the comparator's descriptor ("std::less< K > *", from ci or
+// looked up by that name), and a comparator argument ('std::less< K > const
+// &'; None is the invalid-null-reference error).
+swig_type_info *CompareType(const ContainerInfo &ci);
+bool CompareArg(PyObject *o, void **out, swig_type_info *ty, const ContainerInfo &ci, const char *fn);
+
+// A new 2-tuple of a and b, which are new references (or null); both are
+// released when either is null or the tuple cannot be made.
+PyObject *Pair(PyObject *a, PyObject *b);
+
 // The argument count of an overloaded call, or -1 when args is no tuple.
 inline Py_ssize_t ArgCount(PyObject *args) { return PyTuple_Check(args) ? PyTuple_GET_SIZE(args) : -1; }
 inline PyObject *ArgAt(PyObject *args, Py_ssize_t i) { return PyTuple_GET_ITEM(args, i); }
+// Overload probes of the container (argument 1) and of an iterator.
+bool ProbeSelf(PyObject *args, const ContainerInfo &ci);
+bool ProbeIterator(PyObject *args, Py_ssize_t i, const ContainerInfo &ci);
 
-// NotImplementedError listing the prototypes (each a full text).
-PyObject *Overload(const char *fn, std::initializer_list<std::string> prototypes);
+// NotImplementedError for an overloaded vector / set method (slot), listing
+// its prototypes.
+PyObject *VectorOverloadError(const ContainerInfo &ci, int slot);
+PyObject *SetOverloadError(const ContainerInfo &ci, int slot);
 
 // ---- index and slice rules ------------------------------------------------
 
@@ -48,25 +84,12 @@ size_t CheckIndex(long long i, size_t n, bool allow_end = false);
 // The end of a slice: negative as above, non-negative clipped to n.
 size_t SliceEnd(long long j, size_t n);
 
-// ---- exception guard -----------------------------------------------------
+// ---- exceptions ------------------------------------------------------------
 
-// Runs body; the standard exceptions that container methods throw become
-// IndexError / ValueError with their text, and nothing escapes into the
-// interpreter.
-template <class F>
-PyObject *Guard(F &&body) {
-    try {
-        return body();
-    } catch (const std::out_of_range &e) {
-        return RaiseStdOutOfRange(e.what());
-    } catch (const std::invalid_argument &e) {
-        return RaiseStdInvalidArgument(e.what());
-    } catch (const std::bad_alloc &) {
-        return PyErr_NoMemory();
-    } catch (...) {
-        return RaiseForeign();
-    }
-}
+// Called in a catch (...) block: the standard exceptions that container
+// methods throw become IndexError / ValueError with their text; nothing
+// escapes into the interpreter. Returns null.
+PyObject *Translate();
 
 // ---- single elements -------------------------------------------------------
 //
@@ -89,15 +112,19 @@ constexpr Kind KindOf() {
         return Kind::Value;
 }
 
+// A number by the converter of its type (enumerations as int32); the
+// converter's code. out may be null (a probe).
 template <class T>
-bool NumberArg(PyObject *o, T *v, const char *fn, int argn, const char *type) {
+int NumberTo(PyObject *o, T *out) {
     if constexpr (std::is_enum<T>::value) {
         int32_t x;
-        if (!ArgInt32(o, &x, fn, argn, type)) return false;
-        *v = static_cast<T>(x);
-        return true;
+        int r = ToInt32(o, &x);
+        if (IsOk(r) && out) *out = static_cast<T>(x);
+        return r;
     } else if constexpr (std::is_same<T, bool>::value) {
-        return ArgBool(o, v, fn, argn, type);
+        int r = ToBool(o, out);
+        if (!IsOk(r)) PyErr_Clear();  // the truth test's own error
+        return r;
     } else {
         static_assert(sizeof(T) == 1 || sizeof(T) == 2 || sizeof(T) == 4 || sizeof(T) == 8, "number size");
         typedef typename std::conditional<
@@ -107,28 +134,16 @@ bool NumberArg(PyObject *o, T *v, const char *fn, int argn, const char *type) {
                     typename std::conditional<sizeof(T) == 4, uint32_t, uint64_t>::type>::type>::type,
             typename std::conditional<sizeof(T) <= 4, int32_t, int64_t>::type>::type W;
         W x;
-        bool ok;
-        if constexpr (std::is_same<W, uint8_t>::value) ok = ArgUint8(o, &x, fn, argn, type);
-        else if constexpr (std::is_same<W, uint16_t>::value) ok = ArgUint16(o, &x, fn, argn, type);
-        else if constexpr (std::is_same<W, uint32_t>::value) ok = ArgUint32(o, &x, fn, argn, type);
-        else if constexpr (std::is_same<W, uint64_t>::value) ok = ArgUint64(o, &x, fn, argn, type);
-        else if constexpr (std::is_same<W, int32_t>::value) ok = ArgInt32(o, &x, fn, argn, type);
-        else ok = ArgInt64(o, &x, fn, argn, type);
-        if (ok) *v = static_cast<T>(x);
-        return ok;
+        int r;
+        if constexpr (std::is_same<W, uint8_t>::value) r = ToUint8(o, &x);
+        else if constexpr (std::is_same<W, uint16_t>::value) r = ToUint16(o, &x);
+        else if constexpr (std::is_same<W, uint32_t>::value) r = ToUint32(o, &x);
+        else if constexpr (std::is_same<W, uint64_t>::value) r = ToUint64(o, &x);
+        else if constexpr (std::is_same<W, int32_t>::value) r = ToInt32(o, &x);
+        else r = ToInt64(o, &x);
+        if (IsOk(r) && out) *out = static_cast<T>(x);
+        return r;
     }
-}
-
-template <class T>
-bool NumberProbe(PyObject *o) {
-    if constexpr (std::is_enum<T>::value) return ProbeInt32(o);
-    else if constexpr (std::is_same<T, bool>::value) return ProbeBool(o);
-    else if constexpr (std::is_unsigned<T>::value && sizeof(T) == 1) return ProbeUint8(o);
-    else if constexpr (std::is_unsigned<T>::value && sizeof(T) == 2) return ProbeUint16(o);
-    else if constexpr (std::is_unsigned<T>::value && sizeof(T) == 4) return ProbeUint32(o);
-    else if constexpr (std::is_unsigned<T>::value) return ProbeUint64(o);
-    else if constexpr (sizeof(T) <= 4) return ProbeInt32(o);
-    else return ProbeInt64(o);
 }
 
 template <class T>
@@ -143,17 +158,21 @@ PyObject *NumberOut(T v) {
 
 // One element argument: converted with the protocol's messages; holds the
 // element (or, for class values, a pointer to the caller's object) until
-// scope exit.
+// scope exit. The message's type text is ci.spelled + suffix, built only
+// when the conversion fails.
 template <class E, Kind K = KindOf<E>()>
 class ElemArg;
 
 template <class E>
 class ElemArg<E, Kind::Number> {
 public:
-    bool Convert(PyObject *o, swig_type_info *, const char *fn, int argn, const char *type, bool = false) {
-        return NumberArg(o, &v_, fn, argn, type);
+    bool Convert(PyObject *o, const ContainerInfo &ci, const char *fn, int argn, const char *suffix, bool = false) {
+        int r = NumberTo(o, &v_);
+        if (IsOk(r)) return true;
+        ArgError(r, fn, argn, TypeText(ci, suffix).c_str());
+        return false;
     }
-    static bool Probe(PyObject *o, swig_type_info *) { return NumberProbe<E>(o); }
+    static bool Probe(PyObject *o, swig_type_info *) { return IsOk(NumberTo<E>(o, nullptr)); }
     const E &get() const { return v_; }
 private:
     E v_{};
@@ -162,24 +181,39 @@ private:
 template <class E>
 class ElemArg<E, Kind::String> {
 public:
+    ElemArg() = default;
+    ElemArg(const ElemArg &) = delete;
+    ElemArg &operator=(const ElemArg &) = delete;
+    ~ElemArg() {
+        if (owned_) delete p_;
+    }
     // by_value: a std::string parameter (no string: TypeError); otherwise
     // std::string const & (no string: invalid null reference).
-    bool Convert(PyObject *o, swig_type_info *, const char *fn, int argn, const char *type, bool by_value = false) {
-        return s_.Convert(o, by_value, fn, argn, type);
+    bool Convert(PyObject *o, const ContainerInfo &ci, const char *fn, int argn, const char *suffix,
+                 bool by_value = false) {
+        int r = ToStdString(o, &p_);
+        if (IsOk(r)) owned_ = (r & RESULT_NEW_OBJECT) != 0;
+        if (IsOk(r) && p_) return true;
+        std::string type = TypeText(ci, suffix);
+        if (IsOk(r) && !by_value) NullRefError(fn, argn, type.c_str());
+        else ArgError(by_value ? ERR_TYPE : r, fn, argn, type.c_str());
+        return false;
     }
     static bool Probe(PyObject *o, swig_type_info *) { return ProbeString(o); }
-    const E &get() const { return s_.get(); }
+    const E &get() const { return *p_; }
 private:
-    StrArg s_;
+    E *p_ = nullptr;
+    bool owned_ = false;
 };
 
 template <class E>
 class ElemArg<E, Kind::Pointer> {
 public:
     // None gives a null element.
-    bool Convert(PyObject *o, swig_type_info *ety, const char *fn, int argn, const char *type, bool = false) {
+    bool Convert(PyObject *o, const ContainerInfo &ci, const char *fn, int argn, const char *suffix, bool = false) {
         void *p = nullptr;
-        if (!ArgPtr(o, &p, ety, fn, argn, type)) return false;
+        int r = SWIG_Python_ConvertPtrAndOwn(o, &p, Desc(ci.element), 0);
+        if (!IsOk(r)) return ArgError(r, fn, argn, TypeText(ci, suffix).c_str()), false;
         p_ = static_cast<E>(p);
         return true;
     }
@@ -193,11 +227,17 @@ template <class E>
 class ElemArg<E, Kind::Value> {
 public:
     // None is the invalid-null-reference error.
-    bool Convert(PyObject *o, swig_type_info *ety, const char *fn, int argn, const char *type, bool = false) {
+    bool Convert(PyObject *o, const ContainerInfo &ci, const char *fn, int argn, const char *suffix, bool = false) {
         void *p = nullptr;
-        if (!ArgRef(o, &p, ety, fn, argn, type)) return false;
-        p_ = static_cast<const E *>(p);
-        return true;
+        int r = SWIG_Python_ConvertPtrAndOwn(o, &p, Desc(ci.element), 0);
+        if (IsOk(r) && p) {
+            p_ = static_cast<const E *>(p);
+            return true;
+        }
+        std::string type = TypeText(ci, suffix);
+        if (IsOk(r)) NullRefError(fn, argn, type.c_str());
+        else ArgError(r, fn, argn, type.c_str());
+        return false;
     }
     static bool Probe(PyObject *o, swig_type_info *ety) { return ProbePtr(o, ety); }
     const E &get() const { return *p_; }
@@ -272,20 +312,20 @@ PyObject *ClosedIterator(C &c, PyObject *seq, const ContainerInfo &ci) {
 // PySwigIterator_T<It>; anything else (None included) is a TypeError with
 // the in-method message and type (e.g. 'std::vector< uint32 >::iterator').
 template <class It>
-bool IteratorArg(PyObject *o, swig::PySwigIterator_T<It> **out, const ContainerInfo &ci, const char *fn, int argn,
-                 const std::string &type) {
-    void *p = nullptr;
-    // Without the iterator descriptor any wrapped object would pass: refuse.
-    swig_type_info *ty = Desc(ci.iterator);
-    int r = ty ? SWIG_Python_ConvertPtrAndOwn(o, &p, ty, 0) : ERR_TYPE;
-    swig::PySwigIterator_T<It> *it =
-        IsOk(r) && p ? dynamic_cast<swig::PySwigIterator_T<It> *>(static_cast<swig::PySwigIterator *>(p)) : nullptr;
-    if (!it) {
-        ArgError(IsOk(r) ? ERR_TYPE : r, fn, argn, type.c_str());
-        return false;
-    }
-    *out = it;
-    return true;
+bool IteratorArg(PyObject *o, swig::PySwigIterator_T<It> **out, const ContainerInfo &ci, const char *fn, int argn) {
+    int code = 0;
+    swig::PySwigIterator *base = IteratorObject(o, ci, &code);
+    *out = base ? dynamic_cast<swig::PySwigIterator_T<It> *>(base) : nullptr;
+    if (*out) return true;
+    IteratorTypeError(ci, fn, argn, code);
+    return false;
+}
+
+// An element argument with the type text ci.spelled + suffix.
+template <class E>
+bool ElemConvert(ElemArg<E> &e, PyObject *o, const ContainerInfo &ci, const char *fn, int argn, const char *suffix,
+                 bool by_value = false) {
+    return e.Convert(o, ci, fn, argn, suffix, by_value);
 }
 
 // Refuses an iterator of another container object.

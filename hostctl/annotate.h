@@ -25,5 +25,11 @@
 #define QC_HIDDEN QC_ANNOTATE("hidden")
 // Bind under another Python name (methods: the part after "<Class>_").
 #define QC_PYNAME(name) QC_ANNOTATE("pyname:" name)
+// The library names a type differently from its declaration (for example
+// without its namespace): the bindings give that name a descriptor of its
+// own, with no wrapper class and no cast to the declared class. QC_RESULT_NAME
+// goes first in a function's declaration, QC_NAME first in a parameter's.
+#define QC_RESULT_NAME(name) QC_ANNOTATE("result-name:" name)
+#define QC_NAME(name) QC_ANNOTATE("name:" name)
 
 #endif

@@ -146,10 +146,23 @@ void InstallPointerConstants(PyObject *dict, const swig_const_entry *constants) 
     }
 }
 
-void AttachClassData(swig_type_info *ty, swig_class_data *data) {
+// Attaches data to ty and to the typedef-equivalent descriptors that have no
+// class data yet, or still have ty's previous data (old).
+void AttachClassData(swig_type_info *ty, swig_class_data *data, swig_class_data *old) {
     ty->clientdata = data;
-    for (swig_cast_entry *e = ty->cast; e; e = e->next)
-        if (!e->converter && e->type && !e->type->clientdata) AttachClassData(e->type, data);
+    for (swig_cast_entry *e = ty->cast; e; e = e->next) {
+        swig_type_info *alias = e->type;
+        if (e->converter || !alias || alias == ty) continue;
+        if (!alias->clientdata || (old && alias->clientdata == old)) AttachClassData(alias, data, old);
+    }
+}
+
+void FreeClassData(swig_class_data *d) {
+    Py_CLEAR(d->klass);
+    Py_CLEAR(d->newraw);
+    Py_CLEAR(d->newargs);
+    Py_CLEAR(d->destroy);
+    std::free(d);
 }
 
 }  // namespace
@@ -198,8 +211,13 @@ swig_class_data *MakeClassData(PyObject *cls) {
 void RegisterClass(swig_type_info *ty, PyObject *cls) {
     swig_class_data *data = MakeClassData(cls);
     if (!data) return;
-    AttachClassData(ty, data);
+    // Registering again (a reloaded shadow module) replaces the class data
+    // this descriptor made before; data it only shares with another
+    // registered descriptor stays with that one.
+    swig_class_data *old = ty->owndata ? static_cast<swig_class_data *>(ty->clientdata) : nullptr;
+    AttachClassData(ty, data, old);
     ty->owndata = 1;
+    if (old && old != data) FreeClassData(old);
 }
 
 PyObject *SwigRegister(PyObject *args, swig_type_info *ty) {

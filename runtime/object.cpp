@@ -66,22 +66,27 @@ bool Destroy(PyObject *v, swig_class_data *data) {
     PySwigObject *s = Self(v);
     PyObject *et, *ev, *etb;
     PyErr_Fetch(&et, &ev, &etb);
+    // The call may register the class again, which frees data: keep what is
+    // used after it.
+    PyObject *destroy = data->destroy;
+    Py_INCREF(destroy);
     PyObject *res;
     bool alive = false;
     if (data->delargs) {
         PyObject *tmp = NewSwigObject(s->ptr, s->ty, 0);
-        res = tmp ? PyObject_CallFunctionObjArgs(data->destroy, tmp, nullptr) : nullptr;
+        res = tmp ? PyObject_CallFunctionObjArgs(destroy, tmp, nullptr) : nullptr;
         Py_XDECREF(tmp);
     } else {
         // The function receives v itself: hold a reference for the call.
         Py_REFCNT(v) = 1;
-        res = PyCFunction_GET_FUNCTION(data->destroy)(PyCFunction_GET_SELF(data->destroy), v);
+        res = PyCFunction_GET_FUNCTION(destroy)(PyCFunction_GET_SELF(destroy), v);
         alive = --Py_REFCNT(v) != 0;
     }
     if (res)
         Py_DECREF(res);
     else
-        PyErr_WriteUnraisable(data->destroy);
+        PyErr_WriteUnraisable(destroy);
+    Py_DECREF(destroy);
     PyErr_Restore(et, ev, etb);
     return !alive;
 }

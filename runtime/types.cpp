@@ -10,9 +10,6 @@ namespace {
 
 swig_module_record *g_own = nullptr;
 PyObject *g_this = nullptr;
-// Keeps alive a "this" object that only the attribute lookup referenced
-// (a property computing it), so the borrowed result stays valid.
-PyObject *g_this_keep = nullptr;
 
 swig_type_info *SearchRecord(const swig_module_record *r, const char *name) {
     if (!r->types || r->size == 0) return nullptr;
@@ -64,13 +61,26 @@ bool IsDead(const PySwigObject *s) {
     return Py_TYPE(s) == PySwigObject_Type() && s->dead;
 }
 
+// Whether type->tp_new may be called for cls directly: the checks that
+// type.__new__(cls) makes before it allocates. A class registered with a
+// borrowed __new__ such as dict.__new__ would otherwise get an object laid
+// out as another type.
+bool SafeBuiltinNew(PyTypeObject *type, PyTypeObject *cls) {
+    if (!type->tp_new || !PyType_IsSubtype(cls, type)) return false;
+    PyTypeObject *base = cls;
+    while (base && (base->tp_flags & Py_TPFLAGS_HEAPTYPE)) base = base->tp_base;
+    return !base || base->tp_new == type->tp_new;
+}
+
 // A shadow instance of the registered class holding robj as "this", or null.
 PyObject *NewShadow(swig_class_data *data, PyObject *robj) {
     PyObject *inst = nullptr;
     if (data->newraw) {
         PyObject *self = PyCFunction_Check(data->newraw) ? PyCFunction_GET_SELF(data->newraw) : nullptr;
         if (self && PyType_Check(self) && PyTuple_Check(data->newargs) && PyTuple_GET_SIZE(data->newargs) == 1 &&
-            PyType_Check(PyTuple_GET_ITEM(data->newargs, 0))) {
+            PyType_Check(PyTuple_GET_ITEM(data->newargs, 0)) &&
+            SafeBuiltinNew(reinterpret_cast<PyTypeObject *>(self),
+                           reinterpret_cast<PyTypeObject *>(PyTuple_GET_ITEM(data->newargs, 0)))) {
             // The class keeps a built-in __new__: call the defining type's
             // allocation slot directly, as __new__(cls) would, without a
             // Python-level call per wrapped result.
@@ -78,7 +88,14 @@ PyObject *NewShadow(swig_class_data *data, PyObject *robj) {
             PyTypeObject *cls = reinterpret_cast<PyTypeObject *>(PyTuple_GET_ITEM(data->newargs, 0));
             inst = empty ? reinterpret_cast<PyTypeObject *>(self)->tp_new(cls, empty, nullptr) : nullptr;
         } else {
-            inst = PyObject_Call(data->newraw, data->newargs, nullptr);
+            // The class's __new__ may register the class again, freeing data
+            // and what it holds: keep both alive for the call.
+            PyObject *newraw = data->newraw, *newargs = data->newargs;
+            Py_INCREF(newraw);
+            Py_INCREF(newargs);
+            inst = PyObject_Call(newraw, newargs, nullptr);
+            Py_DECREF(newraw);
+            Py_DECREF(newargs);
         }
         if (inst) {
             PyObject **dictptr = _PyObject_GetDictPtr(inst);
@@ -105,10 +122,7 @@ PyObject *ThisKey() {
     return g_this;
 }
 
-void ReleaseThisKey() {
-    Py_CLEAR(g_this);
-    Py_CLEAR(g_this_keep);
-}
+void ReleaseThisKey() { Py_CLEAR(g_this); }
 
 void SetOwnRecord(swig_module_record *r) { g_own = r; }
 
@@ -191,7 +205,11 @@ PySwigObject *GetThisObject(PyObject *obj) {
             if (!found) {
                 PyErr_Clear();
             } else if (Py_REFCNT(found) == 1) {
-                Py_XSETREF(g_this_keep, found);
+                // Made by the lookup itself (a property computing it): nothing
+                // would keep it, or the library object it may own, alive for
+                // the call, so the object does not count as wrapped.
+                Py_DECREF(found);
+                found = nullptr;
             } else {
                 Py_DECREF(found);
             }

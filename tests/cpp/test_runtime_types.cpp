@@ -278,16 +278,14 @@ TEST_F(RuntimeThis, FindsTheWrappedObjectBehindEveryKindOfHolder) {
     PyObject *so = Global("so");
     for (const char *name : {"so", "n", "o", "c", "s", "nested", "proxy", "cproxy"})
         EXPECT_EQ(qr::GetThisObject(Global(name)), Obj(so)) << name;
-    for (const char *name : {"dead_proxy", "loop", "r", "empty"}) {
+    // A "this" that only the attribute lookup referenced would die before
+    // the call that converts it is over (with two such arguments the first
+    // one's library object was destroyed while the second was looked up):
+    // it does not count as wrapped.
+    for (const char *name : {"dead_proxy", "loop", "r", "empty", "comp"}) {
         EXPECT_EQ(qr::GetThisObject(Global(name)), nullptr) << name;
         EXPECT_EQ(TakeError(), "") << name;
     }
-    // A "this" that only the attribute lookup referenced stays alive for the
-    // caller of GetThisObject.
-    PySwigObject *made = qr::GetThisObject(Global("comp"));
-    ASSERT_NE(made, nullptr);
-    EXPECT_EQ(made->ob_refcnt, 1);
-    EXPECT_EQ(made->ptr, &g_made_target);
 }
 
 using RuntimeWrap = RuntimeTest;

@@ -64,6 +64,8 @@ int64 Square::Shift(int64 v, uint8 bits, uint16 mask, char tag, Bool flag) {
     return static_cast<int64>(shifted & mask) + tag + flag;
 }
 bool Square::operator==(Square const &other) const { return side_ == other.side_; }
+Square *Square::Unnamed() { return Largest(); }
+std::string Square::Measure(Square const &other) { return std::to_string(other.side_); }
 
 uint32 Record::instances = 0;
 const uint32 Record::LIMIT = 4294967295u;

@@ -75,6 +75,9 @@ public:
     Colour Paint(Colour c);
     int64 Shift(int64 v, uint8 bits, uint16 mask, char tag, Bool flag);
     bool operator==(Square const &other) const;
+    // The same objects under a name of their own (no class, no casts).
+    QC_RESULT_NAME("Square") static Square *Unnamed();
+    std::string Measure(QC_NAME("Square") Square const &other);
 private:
     uint32 side_;
     std::string name_;

@@ -158,6 +158,17 @@ class Results(unittest.TestCase):
         self.assertTrue(made.thisown)
         self.assertEqual(made.Describe(), "made 6")
 
+    def test_type_named_otherwise_has_its_own_descriptor(self):
+        opaque = gf.Square.Unnamed()
+        self.assertTrue(repr(opaque).startswith("<Swig Object of type 'Square *' at 0x"))
+        self.assertEqual(gf.Square(1).Measure(opaque), "1000")
+        with self.assertRaises(TypeError) as cm:
+            G.Square_GetSide(opaque)
+        self.assertEqual(str(cm.exception), "in method 'Square_GetSide', argument 1 of type 'Fx::Square const *'")
+        with self.assertRaises(TypeError) as cm:
+            gf.Square(1).Measure(gf.Square(2))
+        self.assertEqual(str(cm.exception), "in method 'Square_Measure', argument 2 of type 'Square const &'")
+
     def test_operator(self):
         self.assertTrue(gf.Square(2) == gf.Square(2, "other"))
         self.assertFalse(gf.Square(2) == gf.Square(3))

@@ -55,6 +55,19 @@ class ThisComputed(object):
         return self._make()
 
 
+class ThisComputedNoDict(object):
+    """The same without an instance dictionary, so "this" is found by the
+    generic attribute lookup, which runs the property."""
+    __slots__ = ("_make",)
+
+    def __init__(self, make):
+        self._make = make
+
+    @property
+    def this(self):
+        return self._make()
+
+
 class Slotted(object):
     __slots__ = ("this",)
 
@@ -150,6 +163,34 @@ class LongSub(long):
     pass
 
 
+# ---- Classes a script might register for a library type ------------------
+
+class DestroyIsWrong(object):
+    """Its destroy function is a builtin that takes one object but deletes
+    nothing."""
+    __swig_destroy__ = len
+
+
+class NewRaises(object):
+    def __new__(cls, *args):
+        raise RuntimeError("no instances")
+
+
+class NewReturnsNone(object):
+    def __new__(cls, *args):
+        return None
+
+
+class BorrowedNew(object):
+    """__new__ taken from another built-in type: an instance laid out as
+    that type would not fit this class."""
+    __new__ = dict.__new__
+
+
+class OldStyleClass:
+    pass
+
+
 def _self_containing():
     l = []
     l.append(l)
@@ -190,8 +231,9 @@ OTHER_SCALARS = [
 ]
 
 
-def values(pool):
-    """Every hostile value as (label, factory). pool may be None."""
+def values(pool, focus=None):
+    """Every hostile value as (label, factory). pool may be None; focus is
+    the type the parameter expects, if it is a library class."""
     out = [("None", lambda: None)]
     out += [(label, (lambda v=v: v)) for label, v in INTEGERS + OTHER_SCALARS]
     out += [
@@ -209,9 +251,13 @@ def values(pool):
         ("truth-raises", TruthRaises),
         ("module", lambda: sys), ("function", lambda: len), ("type", lambda: int),
         ("exception", lambda: ValueError("v")),
+        ("class:destroy=len", lambda: DestroyIsWrong), ("class:new-raises", lambda: NewRaises),
+        ("class:new-returns-None", lambda: NewReturnsNone), ("class:borrowed-new", lambda: BorrowedNew),
+        ("class:oldstyle", lambda: OldStyleClass),
+        ("class:exception", lambda: KeyError),
     ]
     if pool is not None:
-        out += pool.hostile_objects()
+        out += pool.hostile_objects(focus)
     return out
 
 

@@ -11,6 +11,8 @@ fixing one argument at a time.
 import re
 import types
 
+import hostile
+
 ARG_MESSAGE = re.compile(r"argument (\d+) of type '(.*)'$")
 COUNT_MESSAGE = re.compile(r"takes (?:exactly|at least|at most) (\d+) arguments?")
 OVERLOAD_MESSAGE = "Wrong number of arguments for overloaded function"
@@ -28,7 +30,8 @@ class Probe(object):
 
 def callables(module):
     """The module's functions, sorted by name."""
-    return sorted(n for n in dir(module) if isinstance(getattr(module, n), types.BuiltinFunctionType))
+    kinds = (types.BuiltinFunctionType, types.FunctionType)
+    return sorted(n for n in dir(module) if isinstance(getattr(module, n), kinds))
 
 
 def split_params(text):
@@ -237,6 +240,7 @@ class Pool(object):
         self.order = []
         self.deleters = {}  # type -> delete_ function, for owned objects
         self._dead = []  # deleted objects handed out, kept so ids stay unique
+        self.sources = {}  # type -> (function, args) that produced one
 
     def add(self, obj, maker=None, keep=3):
         t = wrapped_type(obj)
@@ -274,30 +278,83 @@ class Pool(object):
                     return None
         return None
 
-    def hostile_objects(self):
-        """Wrapped objects for the battery: one of each type, its bare
-        "this", dead objects, weak proxies and chained views."""
-        import hostile
+    def constructible(self, t):
+        return t in self.deleters and any(m is not None for _, m in self.by_type.get(t, []))
+
+    def sample_types(self, focus, others):
+        """Up to others types besides focus, spread evenly over the pool."""
+        rest = [t for t in self.order if t != focus]
+        if len(rest) > others:
+            step = float(len(rest)) / others
+            rest = [rest[int(i * step)] for i in range(others)]
+        return rest
+
+    def hostile_objects(self, focus=None, others=8):
+        """Wrapped objects for the battery. Of the focus type (the type the
+        parameter expects, when known): the object, its bare "this", a weak
+        proxy, a deleted one, "this" computed on every lookup, and views
+        chained to an object of another type. Of a bounded sample of the
+        other types: the object and its bare "this"."""
         out = []
-        for t in self.order:
+        if focus not in self.by_type:
+            focus = next((t for t in self.order if self.constructible(t)), None)
+        sample = self.sample_types(focus, others)
+        if focus is not None:
+            obj = self.by_type[focus][0][0]
+            out.append(("obj:" + focus, (lambda o=obj: o)))
+            if type(obj).__name__ != "PySwigObject":
+                out.append(("bare:" + focus, (lambda o=obj: o.this)))
+                out.append(("proxy:" + focus, (lambda o=obj: hostile.proxy_to(o))))
+            if self.constructible(focus):
+                f = focus
+                out.append(("fresh-bare:" + f, (lambda f=f: self.fresh_bare(f))))
+                out.append(("dead:" + f, (lambda f=f: self.dead(f))))
+                out.append(("computed-this:" + f,
+                            (lambda f=f: hostile.ThisComputed(lambda: self.fresh_bare(f)))))
+                out.append(("computed-this-nodict:" + f,
+                            (lambda f=f: hostile.ThisComputedNoDict(lambda: self.fresh_bare(f)))))
+                out.append(("computed-shadow-nodict:" + f,
+                            (lambda f=f: hostile.ThisComputedNoDict(lambda: self.fresh_shadow(f)))))
+                if sample:
+                    out.append(("chain:%s+%s" % (f, sample[0]), (lambda f=f, o=sample[0]: self.chained(f, o))))
+            other = next((o for o in sample if self.constructible(o)), None)
+            if other is not None:
+                out.append(("chain:%s+%s" % (other, focus),
+                            (lambda o=other, f=focus: self.chained(o, f))))
+        for t in sample:
             obj = self.by_type[t][0][0]
             out.append(("obj:" + t, (lambda o=obj: o)))
             if type(obj).__name__ != "PySwigObject":
                 out.append(("bare:" + t, (lambda o=obj: o.this)))
-                out.append(("proxy:" + t, (lambda o=obj: hostile.proxy_to(o))))
-            if t in self.deleters and self.fresh(t) is not None:
-                out.append(("dead:" + t, (lambda t=t: self.dead(t))))
-                out.append(("computed-this:" + t, (lambda t=t: hostile.ThisComputed(lambda: self.fresh_bare(t)))))
-        if len(self.order) >= 2:
-            a, b = self.order[0], self.order[-1]
-            if a in self.deleters:
-                out.append(("chain:%s+%s" % (a, b), (lambda: self.chained(a, b))))
         out.append(("proxy:dead", self.dead_proxy))
         return out
+
+    def exercise(self, limit=40):
+        """Makes and drops an object of each type through the function that
+        first produced one: wraps results and destroys owned ones with the
+        class data registered at that moment. Returns the exceptions raised,
+        by class name."""
+        raised = []
+        for t in self.order[:limit]:
+            fn, args = self.sources.get(t, (None, None))
+            if fn is None:
+                continue
+            try:
+                r = fn(*args)
+                repr(r)
+                del r
+            except Exception as e:
+                raised.append(type(e).__name__)
+        return raised
 
     def fresh_bare(self, t):
         obj = self.fresh(t)
         return obj if obj is None or type(obj).__name__ == "PySwigObject" else obj.this
+
+    def fresh_shadow(self, t):
+        """A new owned object of type t inside a shadow-like holder that
+        nothing else references."""
+        return hostile.OldStyleWithThis(self.fresh_bare(t))
 
     def dead(self, t):
         """A new owned object of type t, already deleted."""
@@ -318,8 +375,6 @@ class Pool(object):
         return bare
 
     def dead_proxy(self):
-        import hostile
-
         class Gone(object):
             pass
         g = Gone()
@@ -363,6 +418,7 @@ def build_pool(modules, guard=None, rounds=3):
                     t = wrapped_type(r)
                     if t is None:
                         continue
+                    pool.sources.setdefault(t, (fn, args))
                     if maker is not None and is_owned(r):
                         deleter = pool.deleters.get(("module", m.__name__, name[len("new_"):]))
                         if deleter is not None:
