@@ -152,6 +152,9 @@ class CType:
 
 
 def mangle_name(name):
+    import re
+    # Blanks around template punctuation do not count.
+    name = re.sub(r'\s*([<>,*&])\s*', r'\1', name.strip())
     out = name.replace('::', '__').replace('<', 'T_').replace('>', '_t')
     out = out.replace(',', '_').replace(' ', '_').replace('*', '_p').replace('&', '_r')
     return out

@@ -112,10 +112,21 @@ class Emitter:
         self.module = module
         self.records = set(c.qname for c in model.classes)
         self.containers = {}     # spelled container type -> CType (for SeqIn/SeqOut)
+        self.owned = {}          # descriptor mangled name -> C++ type of owned copies
 
     # -- descriptors used by a type ---------------------------------------
     def desc(self, ctype):
         return self.table.pointer_to(ctype)
+
+    def owned_desc(self, ctype):
+        """The descriptor of an object Python will own: types without a
+        wrapper class get a deleter, so freeing them loses nothing."""
+        d = self.desc(ctype)
+        t = ctype.unconst()
+        if not (t.kind == 'record' and (t.name in self.records or t.alias is None and t.name in self.records)):
+            if t.kind in ('record', 'scalar', 'enum', 'string', 'vector', 'set') and t.name not in self.records:
+                self.owned.setdefault(d.mangled, t.cxx())
+        return d
 
     def container(self, t):
         t = t.unconst()
@@ -130,7 +141,9 @@ class Emitter:
 
     def elem_desc(self, ct):
         e = ct.args[0]
-        return self.desc(e.inner if e.kind == 'pointer' else e)
+        if e.kind == 'pointer':
+            return self.desc(e.inner)
+        return self.owned_desc(e)      # element copies are owned
 
     # -- parameters ----------------------------------------------------------
     def plan_arg(self, fn, n, i, param_t):
@@ -207,7 +220,7 @@ class Emitter:
             ct = self.container(base)
             return 'qr::SeqOut< %s >(%s, %s)' % (ct.cxx(), call, ty_ref(self.elem_desc(ct)))
         if t.kind == 'pointer':
-            d = self.desc(t.inner)
+            d = self.owned_desc(t.inner) if owned else self.desc(t.inner)
             return 'qr::WrapPointer((void *)(%s), %s, %s)' % (call, ty_ref(d), 'qr::POINTER_OWN' if owned else '0')
         if t.kind == 'ref':
             d = self.desc(base)
@@ -215,7 +228,7 @@ class Emitter:
                 return 'qr::WrapPointerKeep((void *)&(%s), %s, %s)' % (call, ty_ref(d), parent)
             return 'qr::WrapPointer((void *)&(%s), %s, 0)' % (call, ty_ref(d))
         if base.kind == 'record':
-            d = self.desc(base)
+            d = self.owned_desc(base)
             return 'qr::WrapPointer(new %s(%s), %s, qr::POINTER_OWN)' % (base.unconst().cxx(), call, ty_ref(d))
         raise ValueError('cannot convert result of type %s' % t.spell())
 
@@ -297,7 +310,7 @@ class ModuleGen:
             if exc == 'swig::stop_iteration':
                 out.append('catch (swig::stop_iteration &) { return qr::RaiseStopIteration(); }')
                 continue
-            d = self.table.pointer_to(CType('record', exc))
+            d = self.em.owned_desc(CType('record', exc))
             out.append('catch (%s &e) { return qr::RaiseLibraryException(new %s(e), %s); }' % (exc, exc, ty_ref(d)))
         for exc, helper in getattr(func, 'std_catches', []):
             out.append('catch (%s &e) { return %s(e.what()); }' % (exc, helper))
@@ -728,7 +741,7 @@ class ModuleGen:
         ops = 'qr::SetOps< %s >' % t.cxx() if is_set else 'qr::VectorOps< %s >' % t.cxx()
         short = '%s< %s >' % ('std::set' if is_set else 'std::vector', e.spell())
         alloc = CType('record', 'std::allocator< %s >' % e.spell())
-        ad = self.table.pointer_to(alloc)
+        ad = em.owned_desc(alloc)
         itd = self.table.get('_p_swig__PySwigIterator', 'swig::PySwigIterator *')
         if e.kind == 'pointer':
             # The element's value_type shares the pointee's descriptor family.
@@ -819,9 +832,13 @@ class ModuleGen:
         m.append(self.type_table_code(self.descs))
         m.append('static swig_const_entry qt_consts[] = {{0, 0, 0, 0, 0, 0}};\n')
         m.extend(self.var_funcs)
+        for mangled, cxx in sorted(self.em.owned.items()):
+            m.append('static void qd_%s(void *p) { delete static_cast< %s * >(p); }' % (mangled, cxx))
         m.append('extern "C" __attribute__((visibility("default"))) void init%s() {' % self.module)
         m.append('  PyObject *d = qr::InitModule(%s, qt_methods, &qt_module, qt_consts);' % cstr(self.module))
         m.append('  if (!d) return;')
+        for mangled in sorted(self.em.owned):
+            m.append('  qr::RegisterDeleter(@T{%s}@, qd_%s);' % (mangled, mangled))
         m.extend(self.init_values)
         m.append('}\n')
         write_if_changed(os.path.join(out_dir, 'module.cpp'), self.resolve('\n'.join(m)))

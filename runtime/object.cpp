@@ -3,6 +3,8 @@
 // interpreter's generic attribute lookup.
 #include "qrinternal.h"
 
+#include <unordered_map>
+
 #include <cinttypes>
 #include <cstdio>
 #include <cstdlib>
@@ -91,12 +93,27 @@ bool Destroy(PyObject *v, swig_class_data *data) {
     return !alive;
 }
 
+// Deleters of types that have no wrapper class (scalars, opaque records,
+// standard exceptions), registered by the module that can delete them.
+std::unordered_map<const swig_type_info *, Deleter> &Deleters() {
+    static std::unordered_map<const swig_type_info *, Deleter> map;
+    return map;
+}
+
+Deleter FindDeleter(const swig_type_info *ty) {
+    auto it = Deleters().find(ty);
+    return it == Deleters().end() ? nullptr : it->second;
+}
+
 void obj_dealloc(PyObject *v) {
     PySwigObject *s = Self(v);
     if (s->own == 1 && !s->dead) {
         swig_class_data *data = s->ty ? static_cast<swig_class_data *>(s->ty->clientdata) : nullptr;
+        Deleter deleter = nullptr;
         if (data && data->destroy) {
             if (!Destroy(v, data)) return;
+        } else if (s->ty && (deleter = FindDeleter(s->ty))) {
+            deleter(s->ptr);
         } else {
             std::printf("swig/python detected a memory leak of type '%s', no destructor found.\n",
                         DisplayName(s->ty));
@@ -292,6 +309,10 @@ PyTypeObject *PySwigPacked_Type() {
 bool IsSwigObject(PyObject *obj) {
     PyTypeObject *t = Py_TYPE(obj);
     return t == PySwigObject_Type() || std::strcmp(t->tp_name, "PySwigObject") == 0;
+}
+
+void RegisterDeleter(swig_type_info *ty, Deleter fn) {
+    if (ty) Deleters()[ty] = fn;
 }
 
 PyObject *NewSwigObject(void *p, swig_type_info *ty, int own) {

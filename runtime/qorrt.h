@@ -154,6 +154,11 @@ PyTypeObject *PySwigObject_Type();
 PyTypeObject *PySwigPacked_Type();
 bool IsSwigObject(PyObject *obj);
 PyObject *NewSwigObject(void *p, swig_type_info *ty, int own);
+// How to delete an owned object of a type that has no wrapper class (so no
+// registered destroy function): scalar copies, opaque records, standard
+// exceptions. Without one, freeing such an owned object only reports the leak.
+typedef void (*Deleter)(void *p);
+void RegisterDeleter(swig_type_info *ty, Deleter fn);
 PyObject *NewSwigPacked(void *bytes, size_t size, swig_type_info *ty);
 // Packed text "_<hex bytes of p in memory order><mangled name>", or false
 // when it does not fit into bufsize.

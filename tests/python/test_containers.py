@@ -236,6 +236,23 @@ class Iterators(unittest.TestCase):
         self.assertRaises(TypeError, v.insert, None, 1)
 
 
+class OwnedCopiesWithoutClass(unittest.TestCase):
+    def test_scalar_and_exception_copies_are_freed_silently(self):
+        import subprocess
+        import sys
+        code = ("import qorctl\n"
+                "items = list(qorctl.Uint32Vector(3))\n"
+                "del items\n"
+                "try:\n"
+                "    qorctl.Uint32Vector(1).begin().equal(qorctl.StringVector(['x']).begin())\n"
+                "except RuntimeError:\n"
+                "    pass\n"
+                "qorctl.Uint64Vector(2).get_allocator()\n"
+                "print 'done'\n")
+        out = subprocess.check_output([sys.executable, "-c", code])
+        self.assertEqual(out, "done\n")
+
+
 class Temporaries(unittest.TestCase):
     def test_sequence_arguments_leave_no_references_behind(self):
         import sys

@@ -32,6 +32,14 @@ class ShadowClasses(unittest.TestCase):
         G.delete_Square(this)
         self.assertFalse(this.own())
 
+    def test_owned_object_of_unregistered_class_reports_the_leak(self):
+        import subprocess
+        import sys
+        code = "import _genfixture as G\nx = G.Square_Make(2)\ndel x\nprint 'done'\n"
+        out = subprocess.check_output([sys.executable, "-c", code])
+        self.assertEqual(out, "swig/python detected a memory leak of type 'Fx::Square *', "
+                              "no destructor found.\ndone\n")
+
     def test_abstract_class_has_no_constructor(self):
         self.assertFalse(hasattr(G, "new_Shape"))
         self.assertRaises(AttributeError, gf.Shape)
