@@ -455,7 +455,7 @@ class ModuleGen:
     def add_class(self, cls):
         d = self.table.pointer_to(CType('record', cls.qname))
         code = self.chunks.setdefault(cls.qname, [])
-        info = {'cls': cls, 'methods': [], 'statics': [], 'fields': [], 'new': None, 'delete': None}
+        info = {'cls': cls, 'methods': [], 'statics': [], 'mixed': [], 'fields': [], 'new': None, 'delete': None}
         # Constructors (an implicit default constructor when none is declared).
         if not cls.abstract:
             ctors = list(cls.ctors)
@@ -486,6 +486,8 @@ class ModuleGen:
             self.add_group(cls.name + '_' + pyname, funcs, cls)
             if all(f.kind == 'static' for f in funcs):
                 info['statics'].append(pyname)
+            elif any(f.kind == 'static' for f in funcs):
+                info['mixed'].append(pyname)
             else:
                 info['methods'].append(pyname)
         # Fields.
@@ -759,7 +761,7 @@ class ModuleGen:
             extra = ', &%s' % ty_ref(cmp_d)
         code.append('static const qr::ContainerInfo qi_%s = {qn_%s, %s, &%s, &%s, &%s, &%s%s};'
                     % (cont.name, cont.name, cstr(short), ty_ref(cd), ty_ref(ed), ty_ref(itd), ty_ref(ad), extra))
-        info = {'cls': cont, 'methods': [], 'statics': [], 'fields': [], 'new': 'new_' + cont.name,
+        info = {'cls': cont, 'methods': [], 'statics': [], 'mixed': [], 'fields': [], 'new': 'new_' + cont.name,
                 'delete': 'delete_' + cont.name, 'container': True}
         for (py, fn), name in zip(slots + [('new', 'new_')], names):
             code.append('PyObject *qw_%s(PyObject *, PyObject *args) { return %s::%s(args, qi_%s); }'
