@@ -48,6 +48,10 @@ uint64 Square::Sum(std::vector<uint64> const &values) {
     return s;
 }
 std::vector<std::string> Square::Words() { return {name_, "has", std::to_string(side_)}; }
+std::vector<std::string> *Square::Labels() {
+    if (labels_.empty()) labels_ = {name_, "label"};
+    return &labels_;
+}
 std::vector<Shape *> Square::Pieces() { return {this, nullptr, Largest()}; }
 Square *Square::Largest() {
     static Square big(1000, "largest");

@@ -66,6 +66,8 @@ public:
     std::string Join(std::vector< std::string > const &parts, std::string sep);
     uint64 Sum(std::vector< uint64 > const &values);
     std::vector< std::string > Words();
+    // The square's own label list, by pointer (borrowed).
+    std::vector< std::string > *Labels();
     std::vector< Shape * > Pieces();
     static Square *Largest();
     QC_OWNED static Square *Make(uint32 side);
@@ -81,6 +83,7 @@ public:
 private:
     uint32 side_;
     std::string name_;
+    std::vector< std::string > labels_;
 };
 
 struct Point {
