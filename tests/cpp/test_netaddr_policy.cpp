@@ -47,11 +47,11 @@ TEST(NetAddrPolicy, SetUnsetAndUnsetAll)
     NicTeamingPolicy t;
     t.SetTeamingPolicy(NicTeamingPolicy::TEAM_POLICY_FO_EXPLICIT);
     t.SetMaxActiveUplinks(-1);
-    t.SetUplinkOrder({"vmnic1", "vmnic0"});
+    t.SetUplinkOrder({"uplink1", "uplink0"});
     EXPECT_TRUE(t.IsSet());
     EXPECT_EQ(NicTeamingPolicy::TEAM_POLICY_FO_EXPLICIT, t.GetTeamingPolicy());
     EXPECT_EQ(-1, t.GetMaxActiveUplinks());
-    EXPECT_EQ((std::vector<std::string>{"vmnic1", "vmnic0"}), t.GetUplinkOrder());
+    EXPECT_EQ((std::vector<std::string>{"uplink1", "uplink0"}), t.GetUplinkOrder());
     t.UnsetTeamingPolicy();
     EXPECT_FALSE(t.HasTeamingPolicy());
     EXPECT_TRUE(t.HasMaxActiveUplinks());
@@ -141,7 +141,7 @@ TEST(NetAddrPolicy, DeriveTakesOnlyWhatIsMissing)
     own.SetDuplex(true);
     team.SetLinkCriteria(own);
     team.SetReversePolicy(false);
-    base.SetUplinkOrder({"vmnic0"});
+    base.SetUplinkOrder({"uplink0"});
     team.Derive(base);
     EXPECT_FALSE(team.GetReversePolicy());
     EXPECT_EQ(NicTeamingPolicy::TEAM_POLICY_LB_SRCID, team.GetTeamingPolicy());
@@ -244,12 +244,12 @@ TEST(NetAddrPolicy, NicCapabilityBits)
 TEST(NetAddrPolicy, CopiesAreIndependent)
 {
     NicTeamingPolicy a;
-    a.SetUplinkOrder({"vmnic0", "vmnic1"});
+    a.SetUplinkOrder({"uplink0", "uplink1"});
     LinkCriteriaSelectionPolicy l;
     l.SetExactSpeed(10);
     a.SetLinkCriteria(l);
     NicTeamingPolicy b(a);
-    b.SetUplinkOrder({"vmnic9"});
+    b.SetUplinkOrder({"uplink9"});
     LinkCriteriaSelectionPolicy got = b.GetLinkCriteria();
     got.SetExactSpeed(99);
     l.SetExactSpeed(77);  // the stored criteria are a copy too
@@ -263,7 +263,7 @@ TEST(NetAddrSerializer, PoliciesRoundTrip)
     NicTeamingPolicy team;
     team.SetTeamingPolicy(NicTeamingPolicy::TEAM_POLICY_LB_IP);
     team.SetNotifySwitchOnFailure(false);
-    team.SetUplinkOrder({"vmnic2", "vmnic0", "vmnic1"});
+    team.SetUplinkOrder({"uplink2", "uplink0", "uplink1"});
     team.SetMaxActiveUplinks(-2147483647 - 1);
     LinkCriteriaSelectionPolicy criteria;
     criteria.SetMinimumSpeed(1000, true);
@@ -352,7 +352,7 @@ TEST(NetAddrSerializer, IpConfigAndRoutingRoundTrip)
 
     IpRouting routing;
     routing.ipv4Gateway = Ipv4Address("10.0.0.1");
-    routing.ipv4GatewayDevice = "vmk0";
+    routing.ipv4GatewayDevice = "hnic0";
     routing.ipv6Gateway = Ipv6Address("fe80::1");
     routing.ipv4Routes.emplace_back(Ipv4Network("172.16.0.0/12"), Ipv4Address("10.0.0.254"));
     routing.ipv6Routes.emplace_back(Ipv6Network("2001:db8:1::/48"), Ipv6Address("fe80::2"));
@@ -360,7 +360,7 @@ TEST(NetAddrSerializer, IpConfigAndRoutingRoundTrip)
     IpRouting routingBack;
     EXPECT_TRUE(NetworkPolicySerializer::LoadConfiguration(branch, routingBack));
     EXPECT_EQ("10.0.0.1", routingBack.ipv4Gateway.GetStringAddress());
-    EXPECT_EQ("vmk0", routingBack.ipv4GatewayDevice);
+    EXPECT_EQ("hnic0", routingBack.ipv4GatewayDevice);
     EXPECT_EQ("fe80::1", routingBack.ipv6Gateway.GetStringAddress());
     ASSERT_EQ(1U, routingBack.ipv4Routes.size());
     EXPECT_EQ("172.16.0.0/12", routingBack.ipv4Routes[0].first.GetStringAddress());
@@ -405,7 +405,7 @@ TEST(NetAddrSerializer, RefusesBadInputAndLeavesPolicyAlone)
         EXPECT_THROW(NetworkPolicySerializer::LoadConfiguration(b, team), HostCtlException) << bad.key << "=" << bad.value;
     }
     ConfigBranchPtr gaps = NewBranch();
-    gaps->GetBranch("uplinkOrder", true)->SetValue("1", "vmnic1");
+    gaps->GetBranch("uplinkOrder", true)->SetValue("1", "uplink1");
     EXPECT_THROW(NetworkPolicySerializer::LoadConfiguration(gaps, team), HostCtlException);
 
     LinkCriteriaSelectionPolicy criteria;

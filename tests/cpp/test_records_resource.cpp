@@ -205,22 +205,22 @@ TEST(RecordsResourceAllocation, DiskSharesDefaultToNormal)
 
 TEST(RecordsResourceGroupSpec, HoldsCopiesOfItsAllocations)
 {
-    ResourceGroupSpec spec;
-    EXPECT_EQ("", spec.name);
-    EXPECT_EQ(RA::RA_EMPTY, spec.cpu.CheckIfValid());
-    EXPECT_EQ(RA::RA_EMPTY, spec.memory.CheckIfValid());
+    ResourceGroupSpec group;
+    EXPECT_EQ("", group.name);
+    EXPECT_EQ(RA::RA_EMPTY, group.cpu.CheckIfValid());
+    EXPECT_EQ(RA::RA_EMPTY, group.memory.CheckIfValid());
 
     CpuResourceAllocation cpu(100, 200, 0, 100, RA::RESOURCE_UNITS_MHZ);
-    spec.cpu = cpu;
+    group.cpu = cpu;
     cpu.SetMaximum(1u);
-    EXPECT_EQ(200u, spec.cpu.GetMaximum());
+    EXPECT_EQ(200u, group.cpu.GetMaximum());
     // The embedded allocation keeps its own kind's rules.
-    EXPECT_THROW(spec.cpu.SetUnits(RA::RESOURCE_UNITS_MB), HostCtlException);
-    SetUnitsText(spec.memory, "MB");
-    EXPECT_TRUE(spec.memory.HasUnits());
+    EXPECT_THROW(group.cpu.SetUnits(RA::RESOURCE_UNITS_MB), HostCtlException);
+    SetUnitsText(group.memory, "MB");
+    EXPECT_TRUE(group.memory.HasUnits());
 
-    ResourceGroupSpec copy = spec;
-    spec.memory.SetMaximum(7u);
+    ResourceGroupSpec copy = group;
+    group.memory.SetMaximum(7u);
     EXPECT_FALSE(copy.memory.HasMaximum());
     EXPECT_EQ(200u, copy.cpu.GetMaximum());
 }
