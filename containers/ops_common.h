@@ -332,6 +332,92 @@ bool ElemConvert(ElemArg<E> &e, PyObject *o, const ContainerInfo &ci, const char
 void CheckOwner(const void *iterator_owner, const void *container);
 
 }  // namespace cont
+// Slot numbers of the operations vectors and sets share.
+struct VectorSlots {
+    enum { iterator = VM_iterator, nonzero = VM_nonzero, empty = VM_empty, len = VM_len, size = VM_size,
+           clear = VM_clear, swap = VM_swap, begin = VM_begin, end = VM_end, rbegin = VM_rbegin,
+           rend = VM_rend };
+};
+struct SetSlots {
+    enum { iterator = SM_iterator, nonzero = SM_nonzero, empty = SM_empty, len = SM_len, size = SM_size,
+           clear = SM_clear, swap = SM_swap, begin = SM_begin, end = SM_end, rbegin = SM_rbegin,
+           rend = SM_rend };
+};
+
+// The methods every container class has, once for vectors and sets.
+template <class C, class S>
+struct CommonOps {
+    static PyObject *iterator(PyObject *args, const ContainerInfo &ci) {
+        PyObject *o[1];
+        C *c;
+        if (!Enter(args, ci, S::iterator, 1, o, &c)) return nullptr;
+        try {
+            return cont::ClosedIterator(*c, o[0], ci);
+        } catch (...) {
+            return cont::Translate();
+        }
+    }
+    static PyObject *nonzero(PyObject *args, const ContainerInfo &ci) {
+        PyObject *o[1];
+        C *c;
+        return Enter(args, ci, S::nonzero, 1, o, &c) ? FromBool(!c->empty()) : nullptr;
+    }
+    static PyObject *empty(PyObject *args, const ContainerInfo &ci) {
+        PyObject *o[1];
+        C *c;
+        return Enter(args, ci, S::empty, 1, o, &c) ? FromBool(c->empty()) : nullptr;
+    }
+    static PyObject *len(PyObject *args, const ContainerInfo &ci) { return Size(args, ci, S::len); }
+    static PyObject *size(PyObject *args, const ContainerInfo &ci) { return Size(args, ci, S::size); }
+    static PyObject *clear(PyObject *args, const ContainerInfo &ci) {
+        PyObject *o[1];
+        C *c;
+        if (!Enter(args, ci, S::clear, 1, o, &c)) return nullptr;
+        c->clear();
+        return NoneResult();
+    }
+    static PyObject *swap(PyObject *args, const ContainerInfo &ci) {
+        PyObject *o[2];
+        C *c;
+        void *other = nullptr;
+        if (!Enter(args, ci, S::swap, 2, o, &c) ||
+            !cont::ContainerRefArg(o[1], &other, ci, ci.names[S::swap], 2, " &"))
+            return nullptr;
+        c->swap(*static_cast<C *>(other));
+        return NoneResult();
+    }
+    static PyObject *begin(PyObject *args, const ContainerInfo &ci) { return At(args, ci, S::begin); }
+    static PyObject *end(PyObject *args, const ContainerInfo &ci) { return At(args, ci, S::end); }
+    static PyObject *rbegin(PyObject *args, const ContainerInfo &ci) { return At(args, ci, S::rbegin); }
+    static PyObject *rend(PyObject *args, const ContainerInfo &ci) { return At(args, ci, S::rend); }
+
+protected:
+    static bool Enter(PyObject *args, const ContainerInfo &ci, int slot, int n, PyObject **o, C **c) {
+        void *p = nullptr;
+        if (!cont::Enter(args, ci, slot, n, o, &p)) return false;
+        *c = static_cast<C *>(p);
+        return true;
+    }
+    static PyObject *Size(PyObject *args, const ContainerInfo &ci, int slot) {
+        PyObject *o[1];
+        C *c;
+        return Enter(args, ci, slot, 1, o, &c) ? FromUint32(static_cast<uint32_t>(c->size())) : nullptr;
+    }
+    static PyObject *At(PyObject *args, const ContainerInfo &ci, int slot) {
+        PyObject *o[1];
+        C *c;
+        if (!Enter(args, ci, slot, 1, o, &c)) return nullptr;
+        try {
+            if (slot == S::begin) return cont::OpenIterator(*c, c->begin(), ci);
+            if (slot == S::end) return cont::OpenIterator(*c, c->end(), ci);
+            if (slot == S::rbegin) return cont::OpenIterator(*c, c->rbegin(), ci);
+            return cont::OpenIterator(*c, c->rend(), ci);
+        } catch (...) {
+            return cont::Translate();
+        }
+    }
+};
+
 }  // namespace qr
 
 #endif

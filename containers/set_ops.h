@@ -13,35 +13,14 @@
 namespace qr {
 
 template <class C>
-struct SetOps {
+struct SetOps : CommonOps<C, SetSlots> {
+    typedef CommonOps<C, SetSlots> Base;
+    using Base::Enter;
     typedef typename C::key_type K;
     typedef typename C::iterator It;
     typedef swig::PySwigIterator_T<It> ItObj;
     typedef cont::ElemArg<K> Elem;
 
-    static PyObject *iterator(PyObject *args, const ContainerInfo &ci) {
-        PyObject *o[1];
-        C *c;
-        if (!Enter(args, ci, SM_iterator, 1, o, &c)) return nullptr;
-        try {
-            return cont::ClosedIterator(*c, o[0], ci);
-        } catch (...) {
-            return cont::Translate();
-        }
-    }
-
-    static PyObject *nonzero(PyObject *args, const ContainerInfo &ci) {
-        PyObject *o[1];
-        C *c;
-        return Enter(args, ci, SM_nonzero, 1, o, &c) ? FromBool(!c->empty()) : nullptr;
-    }
-    static PyObject *empty(PyObject *args, const ContainerInfo &ci) {
-        PyObject *o[1];
-        C *c;
-        return Enter(args, ci, SM_empty, 1, o, &c) ? FromBool(c->empty()) : nullptr;
-    }
-    static PyObject *len(PyObject *args, const ContainerInfo &ci) { return Size(args, ci, SM_len); }
-    static PyObject *size(PyObject *args, const ContainerInfo &ci) { return Size(args, ci, SM_size); }
 
     // append(value): inserts; the value is passed by value.
     static PyObject *append(PyObject *args, const ContainerInfo &ci) {
@@ -87,25 +66,6 @@ struct SetOps {
         }
     }
 
-    static PyObject *clear(PyObject *args, const ContainerInfo &ci) {
-        PyObject *o[1];
-        C *c;
-        if (!Enter(args, ci, SM_clear, 1, o, &c)) return nullptr;
-        c->clear();
-        return NoneResult();
-    }
-
-    static PyObject *swap(PyObject *args, const ContainerInfo &ci) {
-        PyObject *o[2];
-        C *c;
-        void *other = nullptr;
-        if (!Enter(args, ci, SM_swap, 2, o, &c) ||
-            !cont::ContainerRefArg(o[1], &other, ci, ci.names[SM_swap], 2, " &"))
-            return nullptr;
-        c->swap(*static_cast<C *>(other));
-        return NoneResult();
-    }
-
     static PyObject *count(PyObject *args, const ContainerInfo &ci) {
         PyObject *o[2];
         C *c;
@@ -119,10 +79,6 @@ struct SetOps {
         }
     }
 
-    static PyObject *begin(PyObject *args, const ContainerInfo &ci) { return At(args, ci, SM_begin); }
-    static PyObject *end(PyObject *args, const ContainerInfo &ci) { return At(args, ci, SM_end); }
-    static PyObject *rbegin(PyObject *args, const ContainerInfo &ci) { return At(args, ci, SM_rbegin); }
-    static PyObject *rend(PyObject *args, const ContainerInfo &ci) { return At(args, ci, SM_rend); }
 
     static PyObject *find(PyObject *args, const ContainerInfo &ci) { return Lookup(args, ci, SM_find); }
     static PyObject *lower_bound(PyObject *args, const ContainerInfo &ci) { return Lookup(args, ci, SM_lower_bound); }
@@ -229,35 +185,7 @@ struct SetOps {
 private:
     static constexpr const char *kKeyRef = "::key_type const &";
 
-    static bool Enter(PyObject *args, const ContainerInfo &ci, int slot, int n, PyObject **o, C **c) {
-        void *p = nullptr;
-        if (!cont::Enter(args, ci, slot, n, o, &p)) return false;
-        *c = static_cast<C *>(p);
-        return true;
-    }
-
-    static PyObject *Size(PyObject *args, const ContainerInfo &ci, int slot) {
-        PyObject *o[1];
-        C *c;
-        return Enter(args, ci, slot, 1, o, &c) ? FromUint32(static_cast<uint32_t>(c->size())) : nullptr;
-    }
-
     // begin, end, rbegin, rend.
-    static PyObject *At(PyObject *args, const ContainerInfo &ci, int slot) {
-        PyObject *o[1];
-        C *c;
-        if (!Enter(args, ci, slot, 1, o, &c)) return nullptr;
-        try {
-            switch (slot) {
-            case SM_begin: return cont::OpenIterator(*c, c->begin(), ci);
-            case SM_end: return cont::OpenIterator(*c, c->end(), ci);
-            case SM_rbegin: return cont::OpenIterator(*c, c->rbegin(), ci);
-            default: return cont::OpenIterator(*c, c->rend(), ci);
-            }
-        } catch (...) {
-            return cont::Translate();
-        }
-    }
 
     // find, lower_bound, upper_bound, equal_range.
     static PyObject *Lookup(PyObject *args, const ContainerInfo &ci, int slot) {

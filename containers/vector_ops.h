@@ -19,7 +19,9 @@
 namespace qr {
 
 template <class C>
-struct VectorOps {
+struct VectorOps : CommonOps<C, VectorSlots> {
+    typedef CommonOps<C, VectorSlots> Base;
+    using Base::Enter;
     typedef typename C::value_type E;
     typedef typename C::iterator It;
     typedef swig::PySwigIterator_T<It> ItObj;
@@ -27,31 +29,6 @@ struct VectorOps {
 
     // ---- methods without overloads ------------------------------------------
 
-    static PyObject *iterator(PyObject *args, const ContainerInfo &ci) {
-        PyObject *o[1];
-        C *c;
-        if (!Enter(args, ci, VM_iterator, 1, o, &c)) return nullptr;
-        try {
-            return cont::ClosedIterator(*c, o[0], ci);
-        } catch (...) {
-            return cont::Translate();
-        }
-    }
-
-    static PyObject *nonzero(PyObject *args, const ContainerInfo &ci) {
-        PyObject *o[1];
-        C *c;
-        return Enter(args, ci, VM_nonzero, 1, o, &c) ? FromBool(!c->empty()) : nullptr;
-    }
-
-    static PyObject *len(PyObject *args, const ContainerInfo &ci) { return Size(args, ci, VM_len); }
-    static PyObject *size(PyObject *args, const ContainerInfo &ci) { return Size(args, ci, VM_size); }
-
-    static PyObject *empty(PyObject *args, const ContainerInfo &ci) {
-        PyObject *o[1];
-        C *c;
-        return Enter(args, ci, VM_empty, 1, o, &c) ? FromBool(c->empty()) : nullptr;
-    }
 
     static PyObject *capacity(PyObject *args, const ContainerInfo &ci) {
         PyObject *o[1];
@@ -194,25 +171,6 @@ struct VectorOps {
     static PyObject *append(PyObject *args, const ContainerInfo &ci) { return PushBack(args, ci, VM_append); }
     static PyObject *push_back(PyObject *args, const ContainerInfo &ci) { return PushBack(args, ci, VM_push_back); }
 
-    static PyObject *clear(PyObject *args, const ContainerInfo &ci) {
-        PyObject *o[1];
-        C *c;
-        if (!Enter(args, ci, VM_clear, 1, o, &c)) return nullptr;
-        c->clear();
-        return NoneResult();
-    }
-
-    static PyObject *swap(PyObject *args, const ContainerInfo &ci) {
-        PyObject *o[2];
-        C *c;
-        void *other = nullptr;
-        if (!Enter(args, ci, VM_swap, 2, o, &c) ||
-            !cont::ContainerRefArg(o[1], &other, ci, ci.names[VM_swap], 2, " &"))
-            return nullptr;
-        c->swap(*static_cast<C *>(other));
-        return NoneResult();
-    }
-
     static PyObject *get_allocator(PyObject *args, const ContainerInfo &ci) {
         typedef typename C::allocator_type A;
         PyObject *o[1];
@@ -228,10 +186,6 @@ struct VectorOps {
         }
     }
 
-    static PyObject *begin(PyObject *args, const ContainerInfo &ci) { return At(args, ci, VM_begin); }
-    static PyObject *end(PyObject *args, const ContainerInfo &ci) { return At(args, ci, VM_end); }
-    static PyObject *rbegin(PyObject *args, const ContainerInfo &ci) { return At(args, ci, VM_rbegin); }
-    static PyObject *rend(PyObject *args, const ContainerInfo &ci) { return At(args, ci, VM_rend); }
 
     static PyObject *pop_back(PyObject *args, const ContainerInfo &ci) {
         PyObject *o[1];
@@ -442,19 +396,6 @@ struct VectorOps {
 private:
     static constexpr const char *kValueRef = "::value_type const &";
 
-    static bool Enter(PyObject *args, const ContainerInfo &ci, int slot, int n, PyObject **o, C **c) {
-        void *p = nullptr;
-        if (!cont::Enter(args, ci, slot, n, o, &p)) return false;
-        *c = static_cast<C *>(p);
-        return true;
-    }
-
-    static PyObject *Size(PyObject *args, const ContainerInfo &ci, int slot) {
-        PyObject *o[1];
-        C *c;
-        return Enter(args, ci, slot, 1, o, &c) ? FromUint32(static_cast<uint32_t>(c->size())) : nullptr;
-    }
-
     static PyObject *PushBack(PyObject *args, const ContainerInfo &ci, int slot) {
         PyObject *o[2];
         C *c;
@@ -470,21 +411,6 @@ private:
     }
 
     // begin, end, rbegin, rend.
-    static PyObject *At(PyObject *args, const ContainerInfo &ci, int slot) {
-        PyObject *o[1];
-        C *c;
-        if (!Enter(args, ci, slot, 1, o, &c)) return nullptr;
-        try {
-            switch (slot) {
-            case VM_begin: return cont::OpenIterator(*c, c->begin(), ci);
-            case VM_end: return cont::OpenIterator(*c, c->end(), ci);
-            case VM_rbegin: return cont::OpenIterator(*c, c->rbegin(), ci);
-            default: return cont::OpenIterator(*c, c->rend(), ci);
-            }
-        } catch (...) {
-            return cont::Translate();
-        }
-    }
 
     // The position of an iterator argument in c: it must belong to c and lie
     // in [begin, end] ([begin, end) without allow_end). Positions are
