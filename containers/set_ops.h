@@ -185,8 +185,6 @@ struct SetOps : CommonOps<C, SetSlots> {
 private:
     static constexpr const char *kKeyRef = "::key_type const &";
 
-    // begin, end, rbegin, rend.
-
     // find, lower_bound, upper_bound, equal_range.
     static PyObject *Lookup(PyObject *args, const ContainerInfo &ci, int slot) {
         PyObject *o[2];
