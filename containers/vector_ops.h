@@ -410,7 +410,6 @@ private:
         }
     }
 
-    // begin, end, rbegin, rend.
 
     // The position of an iterator argument in c: it must belong to c and lie
     // in [begin, end] ([begin, end) without allow_end). Positions are
