@@ -410,7 +410,6 @@ private:
         }
     }
 
-
     // The position of an iterator argument in c: it must belong to c and lie
     // in [begin, end] ([begin, end) without allow_end). Positions are
     // compared as numbers, so a stale iterator is refused without reading
