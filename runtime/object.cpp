@@ -306,6 +306,17 @@ PyTypeObject *PySwigPacked_Type() {
     return type;
 }
 
+namespace detail {
+
+bool IsFamilyObject(const PySwigObject *s) {
+    const PyTypeObject *t = Py_TYPE(s);
+    return t == PySwigObject_Type() ||
+           (t->tp_basicsize == static_cast<Py_ssize_t>(sizeof(PySwigObject)) &&
+            std::strcmp(t->tp_name, "PySwigObject") == 0);
+}
+
+}  // namespace detail
+
 bool IsSwigObject(PyObject *obj) {
     PyTypeObject *t = Py_TYPE(obj);
     return t == PySwigObject_Type() || std::strcmp(t->tp_name, "PySwigObject") == 0;

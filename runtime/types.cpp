@@ -58,7 +58,7 @@ PySwigObject *NextView(PySwigObject *s) {
 }
 
 bool IsDead(const PySwigObject *s) {
-    return Py_TYPE(s) == PySwigObject_Type() && s->dead;
+    return detail::IsFamilyObject(s) && s->dead;
 }
 
 // Whether type->tp_new may be called for cls directly: the checks that
@@ -235,7 +235,7 @@ int SWIG_Python_ConvertPtrAndOwn(PyObject *obj, void **out, swig_type_info *ty, 
         if (IsDead(s)) return ERR_VALUE;
         if (out) *out = CastPointer(entry, s->ptr);
         if (flags & POINTER_DISOWN) s->own = 0;
-        if ((flags & POINTER_DESTROY) && Py_TYPE(s) == PySwigObject_Type()) s->dead = 1;
+        if ((flags & POINTER_DESTROY) && detail::IsFamilyObject(s)) s->dead = 1;
         return 0;
     }
     return ERR_GENERIC;
@@ -260,7 +260,7 @@ PyObject *WrapPointerKeep(void *p, swig_type_info *ty, PyObject *parent) {
     PyObject *r = WrapPointer(p, ty, 0);
     if (r && r != Py_None && parent) {
         PySwigObject *s = GetThisObject(r);
-        if (s && Py_TYPE(s) == PySwigObject_Type() && !s->keep) {
+        if (s && detail::IsFamilyObject(s) && !s->keep) {
             Py_INCREF(parent);
             s->keep = parent;
         }

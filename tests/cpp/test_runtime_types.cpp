@@ -4,6 +4,7 @@
 
 #include <algorithm>
 #include <cstddef>
+#include <cstdlib>
 #include <cstring>
 #include <vector>
 
@@ -25,13 +26,27 @@ static_assert(offsetof(swig_class_data, klass) == 0 && offsetof(swig_class_data,
               offsetof(swig_class_data, newargs) == 16 && offsetof(swig_class_data, destroy) == 24 &&
               offsetof(swig_class_data, delargs) == 32 && offsetof(swig_class_data, implicitconv) == 36,
               "swig_class_data layout");
-static_assert(offsetof(PySwigObject, ptr) == 16 && offsetof(PySwigObject, ty) == 24 &&
-              offsetof(PySwigObject, own) == 32 && offsetof(PySwigObject, next) == 40 &&
-              offsetof(PySwigObject, dead) == 48, "PySwigObject layout: shared prefix, then dead");
-static_assert(offsetof(PySwigPacked, pack) == 16 && offsetof(PySwigPacked, ty) == 24 &&
-              offsetof(PySwigPacked, size) == 32, "PySwigPacked layout");
+// After the object header: 16 bytes, or 32 for the debug interpreter, whose
+// header also links every object into a list.
+constexpr size_t kHead = sizeof(PyObject);
+static_assert(offsetof(PySwigObject, ptr) == kHead && offsetof(PySwigObject, ty) == kHead + 8 &&
+              offsetof(PySwigObject, own) == kHead + 16 && offsetof(PySwigObject, next) == kHead + 24 &&
+              offsetof(PySwigObject, dead) == kHead + 32, "PySwigObject layout: shared prefix, then dead");
+static_assert(offsetof(PySwigPacked, pack) == kHead && offsetof(PySwigPacked, ty) == kHead + 8 &&
+              offsetof(PySwigPacked, size) == kHead + 16, "PySwigPacked layout");
 
 namespace {
+
+// Releases class data made by a test for a descriptor of its own, which no
+// module teardown will see.
+void FreeTestClassData(swig_class_data *d) {
+    if (!d) return;
+    Py_XDECREF(d->klass);
+    Py_XDECREF(d->newraw);
+    Py_XDECREF(d->newargs);
+    Py_XDECREF(d->destroy);
+    std::free(d);
+}
 
 std::vector<swig_cast_entry *> CastList(swig_type_info *ty) {
     std::vector<swig_cast_entry *> v;
@@ -333,6 +348,8 @@ TEST_F(RuntimeWrap, OldStyleClassesAndFailingMakers) {
     EXPECT_TRUE(f && qr::IsSwigObject(f));
     EXPECT_EQ(TakeError(), "");
     Py_XDECREF(f);
+    FreeTestClassData(static_cast<swig_class_data *>(old_ty.clientdata));
+    FreeTestClassData(static_cast<swig_class_data *>(fail_ty.clientdata));
 }
 
 using RuntimeRegister = RuntimeTest;
@@ -388,6 +405,8 @@ TEST_F(RuntimeRegister, ClassDataOfOldStyleClassesAndDestroyStyles) {
     EXPECT_EQ(nw->destroy, Global("del_varargs"));
     EXPECT_EQ(nw->delargs, 1);
     EXPECT_EQ(TakeError(), "");
+    FreeTestClassData(old);
+    FreeTestClassData(nw);
 }
 
 using RuntimeTeardownDeathTest = RuntimeTest;

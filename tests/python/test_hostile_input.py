@@ -1,5 +1,6 @@
 """Faults the hostile-input sweep found in the runtime, each held down by a
 direct case: input a script may pass must not crash, hang or leak."""
+import gc
 import os
 import sys
 import unittest
@@ -43,6 +44,20 @@ class SequencesThatChange(unittest.TestCase):
         self.assertRaises(TypeError, self.sq.Join, hostile._mutating_list(), "")
 
 
+class DeletedObjects(unittest.TestCase):
+    def test_object_deleted_through_another_module_is_refused(self):
+        # A vector made and deleted by _qorctl, passed to _genfixture, whose
+        # own copy of the runtime must still see that it was deleted.
+        import _qorctl
+        import qorctl  # noqa: F401  (registers the vector classes)
+        dead = _qorctl.new_StringVector()
+        _qorctl.StringVector_append(dead, "a")
+        _qorctl.delete_StringVector(dead)
+        with self.assertRaises(TypeError) as cm:
+            gf.Square(1).Join(dead, "-")
+        self.assertIn("argument 2 of type 'std::vector< std::string", str(cm.exception))
+
+
 class ComputedThis(unittest.TestCase):
     def test_this_made_by_the_lookup_is_not_a_wrapped_object(self):
         # Each lookup makes a new owning object that nothing keeps: accepting
@@ -50,6 +65,7 @@ class ComputedThis(unittest.TestCase):
         # second one is looked up.
         def made():
             return hostile.ThisComputedNoDict(lambda: G.new_Square(3))
+        gc.collect()  # earlier tests' cycles may still hold squares
         before = gf.Shape.Count()
         with self.assertRaises(TypeError) as cm:
             G.Square___eq__(made(), made())
@@ -98,6 +114,7 @@ class Registration(unittest.TestCase):
         G.Square_swigregister(Rereg)
         del Rereg.__swig_destroy__  # the class data holds the only reference
         del destroy
+        gc.collect()
         before = gf.Shape.Count()
         made = gf.Square.Make(5)
         self.assertIsInstance(made, Rereg)

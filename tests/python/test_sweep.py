@@ -89,7 +89,15 @@ def _make_module():
         u64(x)
         return x
 
-    for f in (Crashes, Hangs, ReturnsNullWithoutError, Behaves):
+    kept = []
+
+    def LeaksReferences(x):
+        _argcheck("LeaksReferences", "uint64", _is_u64)(x)
+        if x == 2 ** 31 - 1:
+            kept.append(object())
+        return x
+
+    for f in (Crashes, Hangs, ReturnsNullWithoutError, Behaves, LeaksReferences):
         setattr(m, f.__name__, f)
     return m
 
@@ -109,7 +117,7 @@ class SweepFindsFaults(unittest.TestCase):
     def test_crash_is_attributed_and_the_sweep_goes_on(self):
         self.assertEqual(self.faults("Crashes"), [("crash", "arg1=int:2**32"), ("crash", "arg1=long:2**32")])
         # The calls after the crashing one still ran, the valid one included.
-        self.assertEqual(self.results.functions, 4)
+        self.assertEqual(self.results.functions, 5)
         self.assertGreaterEqual(self.results.outcomes.get("ok", 0), 4)
 
     def test_hang_is_cut_short_and_attributed(self):
@@ -120,10 +128,37 @@ class SweepFindsFaults(unittest.TestCase):
                          ["system-error", "system-error"])
         self.assertEqual(self.faults("Behaves"), [])
 
+    @unittest.skipUnless(hasattr(sys, "gettotalrefcount"), "reference totals need the debug interpreter")
+    def test_reference_leak_is_attributed(self):
+        self.assertEqual(self.faults("LeaksReferences"), [("ref-leak", "arg1=int:2**31-1")])
+
     def test_signature_is_learned_from_the_messages(self):
         m = _make_module()
         sig, = surface.Inferrer(surface.Pool()).infer("Behaves", m.Behaves)
         self.assertEqual((sig.types, sig.valid, sig.complete), (["uint64"], [1], True))
+
+
+@unittest.skipUnless(hasattr(sys, "gettotalrefcount"), "reference totals need the debug interpreter")
+class RefcheckFindsLeaks(unittest.TestCase):
+    def test_growing_test_is_named_and_flat_one_is_not(self):
+        import refcheck
+        kept = []
+
+        class Cases(unittest.TestCase):
+            def test_leaks(self):
+                kept.append([object()])
+
+            def test_keeps_nothing(self):
+                self.made = [object() for _ in range(10)]
+        m = types.ModuleType("_refcheck_standin")
+        m.Cases = Cases
+        sys.modules[m.__name__] = m
+        try:
+            bad = refcheck.check(m.__name__, 2, 4, out=open(os.devnull, "w"))
+        finally:
+            del sys.modules[m.__name__]
+        self.assertEqual([tid.split(".")[-1] for tid, _ in bad], ["test_leaks"])
+        self.assertIn("leaked references per run: [2, 2, 2, 2]", bad[0][1])
 
 
 class Guard(unittest.TestCase):

@@ -3,10 +3,10 @@ valgrind and reports every leaked block and memory error that is not the
 interpreter's own (see valgrind-python.supp).
 
     python2.7 tests/robust/leakcheck.py --build build [--only test_core_host]
-        [--sample 1/8:_qorctl] [--no-sweep]
+        [--sample 1/8:_qorctl] [--no-sweep] [--no-cpp]
 
-Each test module runs as one process; the sweep forks one process per
-function, and each process's report is read. The process exits non-zero
+Each test module runs as one process, and so does the C++ test binary; the
+sweep forks one process per function, and each process's report is read. The process exits non-zero
 when any report has an error.
 """
 import argparse
@@ -66,10 +66,23 @@ def parse(path):
     return errors, lost, records
 
 
-def run(cmd, env, cwd, timeout_note):
-    sys.stdout.write("  %s\n" % timeout_note)
+# Address space for a run under valgrind (valgrind's own included): a call
+# that asks a container for thousands of millions of elements must fail
+# with an exception instead of filling the machine's memory.
+ADDRESS_SPACE = 16 << 30
+
+
+def _limit():
+    import resource
+    resource.setrlimit(resource.RLIMIT_AS, (ADDRESS_SPACE, ADDRESS_SPACE))
+
+
+def run(cmd, env, cwd, note, output):
+    """Runs cmd with its output into the file output; its exit status."""
+    sys.stdout.write("  %s\n" % note)
     sys.stdout.flush()
-    return subprocess.call(cmd, env=env, cwd=cwd, stdout=open(os.devnull, "w"), stderr=subprocess.STDOUT)
+    with open(output, "w") as out:
+        return subprocess.call(cmd, env=env, cwd=cwd, stdout=out, stderr=subprocess.STDOUT, preexec_fn=_limit)
 
 
 def main(argv):
@@ -79,6 +92,7 @@ def main(argv):
     ap.add_argument("--only", nargs="*", help="test modules to run (default: every one)")
     ap.add_argument("--sample", default="1/8:_qorctl", help="the sweep's K/N[:modules] sample")
     ap.add_argument("--no-sweep", action="store_true")
+    ap.add_argument("--no-cpp", action="store_true", help="leave out the C++ test binary")
     a = ap.parse_args(argv)
     build = os.path.abspath(a.build)
     logdir = tempfile.mkdtemp(prefix="qorctl-leakcheck-")
@@ -93,11 +107,19 @@ def main(argv):
         if name in SKIP and not a.only:
             continue
         statuses[name] = run(valgrind(logdir, name) + [a.python, "-m", "unittest", name], env, TESTS,
-                             "%s under valgrind" % name)
+                             "%s under valgrind" % name, os.path.join(logdir, name + ".out"))
+    cpp = os.path.join(build, "tests", "qorctl_cpp_tests")
+    if not a.no_cpp and not a.only and os.path.exists(cpp):
+        statuses["cpp"] = run(valgrind(logdir, "cpp") + [cpp], env, os.path.join(build, "tests"),
+                              "C++ tests under valgrind", os.path.join(logdir, "cpp.out"))
     if not a.no_sweep:
+        env["QORCTL_VALGRIND_LOG"] = "%s/sweep.%%p.log" % logdir
         statuses["sweep"] = run(valgrind(logdir, "sweep") + [a.python, os.path.join(HERE, "sweep.py"),
                                                              "--sample", a.sample, "--timeout", "600"],
-                                env, TESTS, "sweep (%s of _qorctl, all of _genfixture) under valgrind" % a.sample)
+                                env, TESTS, "sweep (%s of _qorctl, all of _genfixture) under valgrind" % a.sample,
+                                os.path.join(logdir, "sweep.out"))
+        with open(os.path.join(logdir, "sweep.out")) as f:
+            sys.stdout.write("".join("    " + l for l in f if not l.startswith(("swig/python", "known fault"))))
     total_errors = 0
     total_lost = {}
     processes = 0
@@ -116,6 +138,8 @@ def main(argv):
         for rec in records[:10]:
             sys.stdout.write("\n".join(rec[:25]) + "\n")
     failed = [n for n, st in sorted(statuses.items()) if st != 0]
+    for name in failed:
+        sys.stdout.write("\n%s failed; its output is in %s\n" % (name, os.path.join(logdir, name + ".out")))
     sys.stdout.write("\nleak check: %d processes, %d errors (leaks and memory errors) after suppressions\n" % (
         processes, total_errors))
     sys.stdout.write("unsuppressed leaked blocks: %s\n" % (", ".join(

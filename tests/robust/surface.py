@@ -321,7 +321,11 @@ class Pool(object):
             if other is not None:
                 out.append(("chain:%s+%s" % (other, focus),
                             (lambda o=other, f=focus: self.chained(o, f))))
-        for t in sample:
+        # Objects of opaque types (no class: a script can only hold them and
+        # pass them back) come back bare; a few always join the sample.
+        opaque = [t for t in self.order if t != focus and t not in sample and
+                  type(self.by_type[t][0][0]).__name__ == "PySwigObject"]
+        for t in sample + opaque[:3]:
             obj = self.by_type[t][0][0]
             out.append(("obj:" + t, (lambda o=obj: o)))
             if type(obj).__name__ != "PySwigObject":
