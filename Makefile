@@ -4,6 +4,7 @@ BUILD ?= build
 PY2 ?= /usr/bin/python2.7
 CMAKE_FLAGS ?=
 JOBS ?= $(shell nproc)
+MAKEFLAGS += --no-print-directory
 
 .PHONY: deps configure build demo check bench clean sanitize refcheck leakcheck
 
