@@ -16,7 +16,7 @@ namespace Hardware {
 class BootDevice {
 public:
     // The firmware's device classes.
-    enum BootDeviceType {
+    enum BootDeviceType : int {
         BOOT_DEV_RESERVED = 0,
         BOOT_DEV_FLOPPY = 1,
         BOOT_DEV_HARDDISK = 2,

@@ -22,7 +22,7 @@ class CpuInfo : public virtual HostCtl::Lib::HostCtlObject {
 public:
     // Why the processors cannot record and replay with hardware assistance;
     // HV_REPLAY_SUPPORTED when nothing stands in the way.
-    enum HVReplayDisabledReason {
+    enum HVReplayDisabledReason : int {
         HV_REPLAY_SUPPORTED = 0,
         HV_REPLAY_INCOMPATIBLE_CPU = 1,
         HV_REPLAY_HV_DISABLED = 2,

@@ -34,13 +34,13 @@ namespace HostCtl {
 namespace Network {
 
 // Address family of an IpAddress.
-enum IpAddressType {
+enum IpAddressType : int {
     IP_ADDRESS_V4 = 0,
     IP_ADDRESS_V6 = 1
 };
 
 // Type and status of an IPv6 interface address.
-enum Ipv6AddressType {
+enum Ipv6AddressType : int {
     IP6_ADDRESS_STATIC = 0,
     IP6_ADDRESS_ANYCAST = 1,
     IP6_ADDRESS_TENTATIVE = 2,
@@ -55,7 +55,7 @@ enum Ipv6AddressType {
     IP6_ADDRESS_UNSET = 11
 };
 
-enum Ipv6Scope {
+enum Ipv6Scope : int {
     IP6_SCOPE_NODELOCAL = 0,
     IP6_SCOPE_LINKLOCAL = 1,
     IP6_SCOPE_SITELOCAL = 2,
@@ -63,7 +63,7 @@ enum Ipv6Scope {
 };
 
 // IPv6 address classes (bit values).
-enum Ipv6AddressClass {
+enum Ipv6AddressClass : int {
     IPV6_ADDR_GLOBAL = 0x0000,
     IPV6_ADDR_LOOPBACK = 0x0010,
     IPV6_ADDR_LINKLOCAL = 0x0020,
@@ -318,7 +318,7 @@ private:
 // these throws HostCtlException. Names compare without regard to case.
 class HostAddress {
 public:
-    enum HostAddressType {
+    enum HostAddressType : int {
         HOST_ADDR_TYPE_IPV4 = 0,
         HOST_ADDR_TYPE_IPV6 = 1,
         HOST_ADDR_TYPE_FDN = 2,

@@ -88,7 +88,7 @@ private:
 // depend on the switch and stay unset.
 class NicTeamingPolicy {
 public:
-    enum TeamPolicyType {
+    enum TeamPolicyType : int {
         TEAM_POLICY_NONE = 0,
         TEAM_POLICY_LB_IP = 1,
         TEAM_POLICY_LB_SRCMAC = 2,
@@ -292,7 +292,7 @@ private:
 #undef HC_NIC_CAPABILITY
 
 // Address operators of access-control rules.
-enum AclAddrOp {
+enum AclAddrOp : int {
     ACL_ADDR_ANY = 0,
     ACL_ADDR_EQ = 1,
     ACL_ADDR_NOTEQ = 2

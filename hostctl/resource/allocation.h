@@ -26,7 +26,7 @@ namespace Resource {
 
 class ResourceAllocation {
 public:
-    enum ResourceUnits {
+    enum ResourceUnits : int {
         RESOURCE_UNITS_PERCENT = 0,
         RESOURCE_UNITS_MHZ = 1,
         RESOURCE_UNITS_BSHARES = 2,
@@ -37,18 +37,18 @@ public:
         RESOURCE_UNITS_INVALID = 7
     };
     // Share levels, stored in the shares field as their uint32 equivalents.
-    enum ResourceShares {
+    enum ResourceShares : int {
         RESOURCE_SHARES_NONE = -1,
         RESOURCE_SHARES_LOW = -2,
         RESOURCE_SHARES_NORMAL = -3,
         RESOURCE_SHARES_HIGH = -4
     };
     // A maximum or minimum limit without bound (stored as 4294967295).
-    enum ResourceValue {
+    enum ResourceValue : int {
         RESOURCE_VALUE_UNLIMITED = -1
     };
     // What CheckIfValid finds, in the order it checks.
-    enum ValidityResult {
+    enum ValidityResult : int {
         RA_OK = 0,
         RA_EMPTY = 1,
         RA_UNITS_NOT_SET = 2,
@@ -116,7 +116,7 @@ protected:
     ResourceAllocation(ResourceAllocation const &other) = default;
     ResourceAllocation &operator=(ResourceAllocation const &other) = default;
 
-    enum SetBits {
+    enum SetBits : int {
         MINIMUM_SET = 1,
         MAXIMUM_SET = 2,
         SHARES_SET = 4,

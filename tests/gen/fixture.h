@@ -26,14 +26,14 @@ private:
     std::string text_;
 };
 
-enum Colour { RED = 1, GREEN = 2, BLUE = 4 };
+enum Colour : int { RED = 1, GREEN = 2, BLUE = 4 };
 
 // Three levels of virtual bases: Shape <- Polygon <- Square, and a second
 // root Named joined in at the bottom.
 class Shape {
 public:
     virtual ~Shape();
-    enum Kind { KIND_ROUND = 0, KIND_ANGULAR = 1 };
+    enum Kind : int { KIND_ROUND = 0, KIND_ANGULAR = 1 };
     virtual int GetKind() const = 0;
     virtual std::string Describe() = 0;
     static int Count();
