@@ -75,8 +75,11 @@ bool Destroy(PyObject *v, swig_class_data *data) {
     PyObject *res;
     bool alive = false;
     if (data->delargs) {
-        PyObject *tmp = NewSwigObject(s->ptr, s->ty, 0);
+        // The temporary stands for the owning object during the call (so
+        // delete_<Class> accepts it); it never destroys anything itself.
+        PyObject *tmp = NewSwigObject(s->ptr, s->ty, 1);
         res = tmp ? PyObject_CallFunctionObjArgs(destroy, tmp, nullptr) : nullptr;
+        if (tmp) reinterpret_cast<PySwigObject *>(tmp)->own = 0;
         Py_XDECREF(tmp);
     } else {
         // The function receives v itself: hold a reference for the call.

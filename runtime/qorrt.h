@@ -120,7 +120,8 @@ const int POINTER_OWN = 1;
 const int POINTER_NO_SHADOW = 2;
 const int POINTER_DISOWN = 1;
 // Internal: the caller is about to destroy the object (delete_<Class>);
-// the wrapped object is disowned and marked dead.
+// the wrapped object is disowned and marked dead. An object that does not
+// own its pointer is refused (ERR_VALUE): it is not Python's to destroy.
 const int POINTER_DESTROY = 0x100;
 
 PyObject *ErrorClassFor(int code);

@@ -233,6 +233,9 @@ int SWIG_Python_ConvertPtrAndOwn(PyObject *obj, void **out, swig_type_info *ty, 
         }
         // Checked before any cast: a converter reads the object's vtable.
         if (IsDead(s)) return ERR_VALUE;
+        // Only an object Python owns may be destroyed: a borrowed one belongs
+        // to the library (or lives inside another object's storage).
+        if ((flags & POINTER_DESTROY) && s->own != 1) return ERR_VALUE;
         if (out) *out = CastPointer(entry, s->ptr);
         if (flags & POINTER_DISOWN) s->own = 0;
         if ((flags & POINTER_DESTROY) && detail::IsFamilyObject(s)) s->dead = 1;

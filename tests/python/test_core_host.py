@@ -145,5 +145,25 @@ class Implementation(unittest.TestCase):
                             for l in lines), out)
 
 
+
+class DeletingBorrowedObjects(unittest.TestCase):
+    def test_delete_refuses_objects_python_does_not_own(self):
+        host = qorctl.HostFactory.GetHost()
+        with self.assertRaises(ValueError) as cm:
+            Q.delete_Host(host)
+        self.assertEqual(str(cm.exception), "in method 'delete_Host', argument 1 of type 'HostCtl::Host *'")
+        with self.assertRaises(ValueError):
+            Q.delete_HostCtlObject(host.GetAdvancedOptions())
+        # The library's objects are untouched.
+        self.assertEqual(qorctl.HostFactory.GetHost().GetName(), host.GetName())
+        self.assertEqual(host.GetAdvancedOptions().GetBranchName(), "")
+
+    def test_owned_objects_are_still_deleted_once(self):
+        impl = qorctl.HostImpl()
+        Q.delete_HostImpl(impl)
+        self.assertFalse(impl.thisown)
+        self.assertRaises(ValueError, Q.delete_HostImpl, impl)
+        self.assertRaises(ValueError, impl.GetName)
+
 if __name__ == "__main__":
     unittest.main()
