@@ -1,5 +1,6 @@
 """Writes the C++ side of a module: wrappers, method table, type table, init."""
 
+from cparse import Function
 from ctype import CType, SCALARS, RANK_POINTER, RANK_STRING, RANK_CONTAINER, canonical_scalar_name
 import clang.cindex as ci
 
@@ -168,8 +169,7 @@ class Emitter:
             return ArgPlan(decl, '%s.get()' % a, 'qr::ProbeString(%s)', RANK_STRING, 'string')
         if t.kind == 'pointer' and is_char(t.inner):
             decl = 'qr::CharPtrArg %s; if (!%s.Convert(%s, F, %d, %s)) return 0;' % (a, a, o, n, cstr(spelled))
-            cast = '' if not t.inner.const else ''
-            return ArgPlan(decl, cast + '%s.get()' % a, 'qr::ProbeString(%s)', RANK_STRING, 'string')
+            return ArgPlan(decl, '%s.get()' % a, 'qr::ProbeString(%s)', RANK_STRING, 'string')
         if base.kind in ('vector', 'set'):
             ct = self.container(base)
             d = self.desc(ct)
@@ -298,7 +298,6 @@ class ModuleGen:
         self.em = Emitter(model, self.table, module)
         self.wrappers = []          # public wrappers in method-table order
         self.chunks = {}            # class qname or '' -> list of code
-        self.class_wrappers = {}    # qname -> {'new':..., 'delete':..., methods...}
         self.shadow = []            # per class: info for the Python shadow module
         self.extends = extends
         self.docs = {}              # class qname -> prototypes, for doc strings
@@ -460,7 +459,6 @@ class ModuleGen:
         if not cls.abstract:
             ctors = list(cls.ctors)
             if not cls.has_declared_ctor:
-                from cparse import Function
                 ctors = [Function('ctor', cls.name, cls.qname, None, [], [])]
             if ctors:
                 self.add_group('new_' + cls.name, ctors, cls)
@@ -782,7 +780,7 @@ class ModuleGen:
         self.shadow.append(info)
 
     # -- output -------------------------------------------------------------------
-    def generate(self, extends=()):
+    def generate(self):
         for cont in self.model.containers:
             self.add_container(cont)
         for cls in self.model.classes:

@@ -68,13 +68,9 @@ class _Exception(Exception):
 def write_shadow(gen, path):
     model = gen.model
     ext = gen.module
-    protos = {}
     out = (PRELUDE % {'ext': ext}).split('\n')
     defined = set()
     infos = {i['cls'].qname: i for i in gen.shadow}
-    sigs = {}
-    for w in gen.wrappers:
-        sigs.setdefault(w.pyname, w)
 
     def emit(cls):
         if cls.qname in defined:
